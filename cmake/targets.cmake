@@ -1,0 +1,20 @@
+# What all targets of the project have in common.
+function(dcm_set_up target)
+    target_compile_features(${target} PUBLIC cxx_std_20)
+    set_target_properties(${target} PROPERTIES CXX_EXTENSIONS OFF)
+    target_compile_options(${target} PRIVATE -Wall -Wextra -Wpedantic -Wconversion -Wshadow
+                           $<$<BOOL:${DCM_WERROR}>:-Werror>)
+endfunction()
+
+# Keeps of the listed files those that exist, and names the others.
+function(dcm_keep_existing list)
+    set(kept)
+    foreach(file IN LISTS ${list})
+        if(EXISTS "${CMAKE_CURRENT_SOURCE_DIR}/${file}")
+            list(APPEND kept "${file}")
+        else()
+            message(STATUS "dcm: not there yet: ${file}")
+        endif()
+    endforeach()
+    set(${list} "${kept}" PARENT_SCOPE)
+endfunction()
