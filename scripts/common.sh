@@ -1,0 +1,26 @@
+# shellcheck shell=bash
+# What the scripts share; they source it right after `set -euo pipefail`.
+
+cd "$(dirname "${BASH_SOURCE[0]}")/.."
+export CMAKE_BUILD_PARALLEL_LEVEL=${CMAKE_BUILD_PARALLEL_LEVEL:-$(nproc)}
+
+# Runs a command and shows what it printed only if it failed.
+quietly() {
+    local log
+    log=$(mktemp)
+    if "$@" >"$log" 2>&1; then
+        rm -f "$log"
+    else
+        local status=$?
+        cat "$log" >&2
+        rm -f "$log"
+        echo "failed (exit status $status): $*" >&2
+        return "$status"
+    fi
+}
+
+# Configures and builds the preset named.
+build() {
+    quietly cmake --preset "$1"
+    quietly cmake --build --preset "$1"
+}
