@@ -1,7 +1,7 @@
 # shellcheck shell=bash
 # What the scripts share; they source it right after `set -euo pipefail`.
 
-cd "$(dirname "${BASH_SOURCE[0]}")/.."
+cd "$(dirname "${BASH_SOURCE[0]}")/.." || exit
 export CMAKE_BUILD_PARALLEL_LEVEL=${CMAKE_BUILD_PARALLEL_LEVEL:-$(nproc)}
 
 # Runs a command and shows what it printed only if it failed.
@@ -23,4 +23,15 @@ quietly() {
 build() {
     quietly cmake --preset "$1"
     quietly cmake --build --preset "$1"
+}
+
+# Builds the preset named, runs its tests and prints their summary.
+build_and_test() {
+    build "$1"
+    local log=build/$1/ctest.log
+    if ! ctest --preset "$1" -j "$CMAKE_BUILD_PARALLEL_LEVEL" >"$log" 2>&1; then
+        cat "$log" >&2
+        return 1
+    fi
+    grep 'tests passed' "$log"
 }
