@@ -1,0 +1,138 @@
+#include "dcm/platform/cfile.h"
+
+#include "dcm/platform/codepage.h"
+#include "dcm/platform/system_file.h"
+
+#include <string>
+#include <system_error>
+
+namespace {
+
+std::string Describe(CFileException::Cause cause, long osError, const CString& fileName)
+{
+    std::string text = dcm::ToUtf8(fileName);
+    text += ": ";
+    if (osError != 0)
+        return text += std::system_category().message(static_cast<int>(osError));
+    switch (cause) {
+    case CFileException::invalidFile:
+        return text += "not an open file";
+    case CFileException::accessDenied:
+        return text += "not a file that can be read or written as a whole";
+    case CFileException::fileTooLarge:
+        return text += "2 GiB or larger";
+    case CFileException::diskFull:
+        return text += "no room for all of the text";
+    default:
+        return text += "file error";
+    }
+}
+
+} // namespace
+
+CFileException::CFileException() : std::runtime_error(""), m_cause(none), m_lOsError(0)
+{}
+
+CFileException::CFileException(Cause cause, long osError, const CString& fileName)
+    : std::runtime_error(Describe(cause, osError, fileName)), m_cause(cause), m_lOsError(osError),
+      m_strFileName(fileName)
+{}
+
+CFileException::~CFileException() = default;
+
+CFile::CFile() noexcept : m_handle(dcm::system::kNoFile)
+{}
+
+CFile::CFile(const CString& path, UINT flags) : CFile()
+{
+    CFileException error;
+    if (!CFile::Open(path, flags, &error))
+        throw CFileException(error);
+}
+
+CFile::~CFile()
+{
+    if (m_handle != dcm::system::kNoFile)
+        dcm::system::CloseFile(m_handle);
+}
+
+BOOL CFile::Open(const wchar_t* path, UINT flags, CFileException* error)
+{
+    Close();
+    m_strFileName = CString(path);
+    long osError = 0;
+    CFileException::Cause refusal = CFileException::none;
+    m_handle = dcm::system::OpenFile(m_strFileName, flags, osError, refusal);
+    if (m_handle != dcm::system::kNoFile)
+        return TRUE;
+    if (error != nullptr) {
+        const auto cause = osError != 0 ? dcm::system::CauseOf(osError) : refusal;
+        *error = CFileException(cause, osError, m_strFileName);
+    }
+    return FALSE;
+}
+
+BOOL CFile::GetStatus(CFileStatus& status) const
+{
+    return m_handle != dcm::system::kNoFile &&
+           dcm::system::FileLength(m_handle, status.m_size) == 0;
+}
+
+ULONGLONG CFile::GetLength() const
+{
+    std::uint64_t length = 0;
+    if (m_handle == dcm::system::kNoFile)
+        Throw(0);
+    if (const long error = dcm::system::FileLength(m_handle, length))
+        Throw(error);
+    return length;
+}
+
+UINT CFile::Read(void* buffer, UINT count)
+{
+    if (m_handle == dcm::system::kNoFile)
+        Throw(0);
+    auto* const bytes = static_cast<char*>(buffer);
+    std::size_t total = 0;
+    while (total < count) {
+        std::size_t done = 0;
+        if (const long error = dcm::system::ReadSome(m_handle, bytes + total, count - total, done))
+            Throw(error);
+        if (done == 0)
+            break;
+        total += done;
+    }
+    return static_cast<UINT>(total);
+}
+
+void CFile::Write(const void* buffer, UINT count)
+{
+    if (m_handle == dcm::system::kNoFile)
+        Throw(0);
+    const auto* const bytes = static_cast<const char*>(buffer);
+    std::size_t total = 0;
+    while (total < count) {
+        std::size_t done = 0;
+        if (const long error = dcm::system::WriteSome(m_handle, bytes + total, count - total, done))
+            Throw(error);
+        if (done == 0)
+            throw CFileException(CFileException::diskFull, 0, m_strFileName);
+        total += done;
+    }
+}
+
+void CFile::Close()
+{
+    if (m_handle == dcm::system::kNoFile)
+        return;
+    const auto handle = m_handle;
+    m_handle = dcm::system::kNoFile;
+    if (const long error = dcm::system::CloseFile(handle))
+        Throw(error);
+}
+
+void CFile::Throw(long osError) const
+{
+    const auto cause = osError != 0 ? dcm::system::CauseOf(osError) : CFileException::invalidFile;
+    throw CFileException(cause, osError, m_strFileName);
+}

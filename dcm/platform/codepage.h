@@ -1,0 +1,53 @@
+#pragma once
+
+#include "dcm/library/export.h"
+#include "dcm/platform/cstring.h"
+
+#include <cstddef>
+#include <memory>
+#include <string>
+#include <string_view>
+
+namespace dcm {
+
+/// Chooses the ANSI code page of the calling thread by its Windows identifier: 1252 (where a
+/// thread starts on Linux), 28591 for ISO-8859-1, 65001 for UTF-8, or any other that the system
+/// can convert. Returns false, and changes nothing, when the identifier is unknown.
+DCM_API bool SetThreadCodePage(unsigned identifier);
+
+/// Encodings in which a text can be cut at a line feed or a zero byte before it is widened: these
+/// bytes stand for themselves and are part of no other character.
+enum class Encoding : unsigned char
+{
+    kWindows1252,
+    kLatin1,
+    kUtf8,
+};
+
+/// The bytes of a text file in an encoding that can be cut.
+struct FileText
+{
+    std::unique_ptr<char[]> bytes;
+    std::size_t size = 0;
+    Encoding encoding = Encoding::kWindows1252;
+
+    std::string_view View() const { return {bytes.get(), size}; }
+};
+
+/// Takes the bytes of a file in the thread's code page. They stay as they are where that page can
+/// be cut; text of any other page is converted to UTF-8 whole.
+FileText FileTextFromThreadCodePage(std::unique_ptr<char[]> bytes, std::size_t size);
+
+/// Appends the wide form of `bytes`. Bytes that are no character in UTF-8 become U+FFFD.
+void AppendWide(CString& text, std::string_view bytes, Encoding encoding);
+
+/// The wide form of `bytes` in the thread's code page.
+CString Widen(std::string_view bytes);
+
+/// `text` in the thread's code page; a character that the page lacks becomes `?`.
+std::string Narrow(std::wstring_view text);
+
+/// `text` in UTF-8; what is no character becomes U+FFFD.
+std::string ToUtf8(std::wstring_view text);
+
+} // namespace dcm

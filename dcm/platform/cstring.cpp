@@ -1,0 +1,166 @@
+#include "dcm/platform/cstring.h"
+
+#include "dcm/platform/codepage.h"
+#include "dcm/platform/exception.h"
+#include "dcm/platform/text.h"
+
+#include <algorithm>
+#include <cwchar>
+#include <limits>
+#include <new>
+#include <utility>
+
+namespace {
+
+constinit dcm::TextConstant kEmpty{L""};
+
+/// The longest text: its length is a signed 32-bit number.
+constexpr std::size_t kMaxLength = std::numeric_limits<std::int32_t>::max() - 1;
+
+bool IsStatic(const dcm::CStringData& data)
+{
+    return data.references.load(std::memory_order_relaxed) < 0;
+}
+
+dcm::CStringData* NewData(std::size_t capacity)
+{
+    if (capacity > kMaxLength)
+        dcm::ThrowResult(E_OUTOFMEMORY);
+    void* const memory =
+        ::operator new(sizeof(dcm::CStringData) + (capacity + 1) * sizeof(wchar_t));
+    auto* const data = new (memory) dcm::CStringData{1, 0, static_cast<std::int32_t>(capacity)};
+    data->Text()[0] = L'\0';
+    return data;
+}
+
+} // namespace
+
+CString::CString() noexcept : CString(kEmpty)
+{}
+
+CString::CString(const wchar_t* text) : CString(Whole(text))
+{}
+
+CString::CString(const char* text)
+    : CString(dcm::Widen(text == nullptr ? std::string_view() : std::string_view(text)))
+{}
+
+CString::CString(std::wstring_view text) : CString()
+{
+    if (text.empty())
+        return;
+    m_data = NewData(text.size());
+    EndExtend(std::copy(text.begin(), text.end(), m_data->Text()));
+}
+
+CString::CString(const CString& other) noexcept : m_data(other.m_data)
+{
+    if (!IsStatic(*m_data))
+        m_data->references.fetch_add(1, std::memory_order_relaxed);
+}
+
+CString::CString(CString&& other) noexcept : CString()
+{
+    std::swap(m_data, other.m_data);
+}
+
+CString& CString::operator=(const CString& other) noexcept
+{
+    CString copy(other);
+    std::swap(m_data, copy.m_data);
+    return *this;
+}
+
+CString& CString::operator=(CString&& other) noexcept
+{
+    std::swap(m_data, other.m_data);
+    return *this;
+}
+
+CString::~CString()
+{
+    Release();
+}
+
+wchar_t CString::GetAt(int index) const
+{
+    if (index < 0 || index >= GetLength())
+        dcm::ThrowResult(E_INVALIDARG);
+    return m_data->Text()[index];
+}
+
+int CString::Compare(std::wstring_view other) const noexcept
+{
+    return View().compare(other);
+}
+
+int CString::CompareNoCase(std::wstring_view other) const noexcept
+{
+    const std::wstring_view own = View();
+    const auto order = std::lexicographical_compare_three_way(
+        own.begin(), own.end(), other.begin(), other.end(),
+        [](wchar_t a, wchar_t b) { return dcm::FoldCase(a) <=> dcm::FoldCase(b); });
+    return order < 0 ? -1 : order > 0 ? 1 : 0;
+}
+
+void CString::Empty() noexcept
+{
+    // A shared text stays with its other owners.
+    if (IsStatic(*m_data) || m_data->references.load(std::memory_order_acquire) != 1) {
+        *this = CString();
+        return;
+    }
+    EndExtend(m_data->Text());
+}
+
+CString& CString::Append(std::wstring_view text)
+{
+    if (text.empty())
+        return *this;
+    // `text` may be a part of this string, whose memory Extend can replace.
+    const CString keep(text.data() >= m_data->Text() && text.data() <= m_data->Text() + GetLength()
+                           ? *this
+                           : CString());
+    EndExtend(std::copy(text.begin(), text.end(), Extend(text.size())));
+    return *this;
+}
+
+wchar_t* CString::Extend(std::size_t room)
+{
+    const auto length = static_cast<std::size_t>(m_data->length);
+    const auto capacity = static_cast<std::size_t>(m_data->capacity);
+    if (room > kMaxLength - length)
+        dcm::ThrowResult(E_OUTOFMEMORY);
+    // Half as much again, so that a text that grows piece by piece is copied a few times only.
+    if (length + room > capacity)
+        Grow(std::max(length + room, std::min(capacity + capacity / 2, kMaxLength)));
+    else if (m_data->references.load(std::memory_order_acquire) != 1)
+        Grow(capacity);
+    return m_data->Text() + length;
+}
+
+void CString::EndExtend(const wchar_t* end) noexcept
+{
+    wchar_t* const text = m_data->Text();
+    m_data->length = static_cast<std::int32_t>(end - text);
+    text[m_data->length] = L'\0';
+}
+
+void CString::Grow(std::size_t capacity)
+{
+    dcm::CStringData* const data = NewData(capacity);
+    std::wmemcpy(data->Text(), m_data->Text(), static_cast<std::size_t>(m_data->length) + 1);
+    data->length = m_data->length;
+    Release();
+    m_data = data;
+}
+
+void CString::Release() noexcept
+{
+    if (IsStatic(*m_data))
+        return;
+    // The last owner needs no second look at the count: nobody else can share the text any more.
+    if (m_data->references.load(std::memory_order_acquire) == 1 ||
+        m_data->references.fetch_sub(1, std::memory_order_acq_rel) == 1)
+        ::operator delete(m_data);
+}

@@ -1,0 +1,119 @@
+#pragma once
+
+#include "dcm/library/export.h"
+
+#include <cstdint>
+
+using BOOL = int;
+using UINT = unsigned int;
+using LONG = std::int32_t;
+using ULONGLONG = unsigned long long;
+using VARTYPE = unsigned short;
+using VARIANT_BOOL = short;
+
+inline constexpr BOOL FALSE = 0;
+inline constexpr BOOL TRUE = 1;
+inline constexpr VARIANT_BOOL VARIANT_FALSE = 0;
+inline constexpr VARIANT_BOOL VARIANT_TRUE = -1;
+
+/// The outcome of a call: negative for a failure, 0 (`S_OK`) for success.
+using HRESULT = std::int32_t;
+
+inline constexpr HRESULT S_OK = 0;
+inline constexpr HRESULT E_UNEXPECTED = static_cast<HRESULT>(0x8000FFFFU);
+inline constexpr HRESULT E_POINTER = static_cast<HRESULT>(0x80004003U);
+inline constexpr HRESULT E_FAIL = static_cast<HRESULT>(0x80004005U);
+inline constexpr HRESULT E_OUTOFMEMORY = static_cast<HRESULT>(0x8007000EU);
+inline constexpr HRESULT E_INVALIDARG = static_cast<HRESULT>(0x80070057U);
+inline constexpr HRESULT DISP_E_BADVARTYPE = static_cast<HRESULT>(0x80020008U);
+
+constexpr bool SUCCEEDED(HRESULT result)
+{
+    return result >= 0;
+}
+constexpr bool FAILED(HRESULT result)
+{
+    return result < 0;
+}
+
+/// The text of a variant: wide characters behind a length of four bytes, zero-terminated. Made by
+/// `SysAllocString`, released by `SysFreeString`; a null pointer is an absent text.
+using BSTR = wchar_t*;
+
+/// Type tags of a variant. `VT_BYREF` marks a pointer to a value that the variant does not own.
+enum VARENUM : VARTYPE
+{
+    VT_EMPTY = 0,
+    VT_NULL = 1,
+    VT_I2 = 2,
+    VT_I4 = 3,
+    VT_R4 = 4,
+    VT_R8 = 5,
+    VT_CY = 6,
+    VT_DATE = 7,
+    VT_BSTR = 8,
+    VT_ERROR = 10,
+    VT_BOOL = 11,
+    VT_VARIANT = 12,
+    VT_I1 = 16,
+    VT_UI1 = 17,
+    VT_UI2 = 18,
+    VT_UI4 = 19,
+    VT_I8 = 20,
+    VT_UI8 = 21,
+    VT_INT = 22,
+    VT_UINT = 23,
+    VT_BYREF = 0x4000,
+};
+
+/// A value with its type tag. A plain structure: it releases nothing by itself.
+struct VARIANT
+{
+    VARTYPE vt;
+    std::uint16_t wReserved1;
+    std::uint16_t wReserved2;
+    std::uint16_t wReserved3;
+    union
+    {
+        double dblVal;
+        float fltVal;
+        signed char cVal;
+        unsigned char bVal;
+        std::int16_t iVal;
+        std::uint16_t uiVal;
+        std::int32_t lVal;
+        std::uint32_t ulVal;
+        std::int64_t llVal;
+        std::uint64_t ullVal;
+        std::int32_t intVal;
+        std::uint32_t uintVal;
+        VARIANT_BOOL boolVal;
+        std::int32_t scode;
+        BSTR bstrVal;
+        void* byref;
+    };
+};
+static_assert(sizeof(VARIANT) == 16);
+
+/// Makes `variant` empty without looking at what it held.
+DCM_API void VariantInit(VARIANT* variant) noexcept;
+
+/// Releases the content of `variant` and makes it empty. A tag that is none of the above is
+/// answered with `DISP_E_BADVARTYPE` and left alone.
+DCM_API HRESULT VariantClear(VARIANT* variant) noexcept;
+
+/// Clears `target` and gives it a copy of `source`, with a text of its own. On a failure
+/// (`E_OUTOFMEMORY`, `DISP_E_BADVARTYPE`) the target is empty, or as clearing it left it.
+DCM_API HRESULT VariantCopy(VARIANT* target, const VARIANT* source) noexcept;
+
+/// A new copy of a zero-terminated text; null when `text` is null or memory runs out.
+DCM_API BSTR SysAllocString(const wchar_t* text) noexcept;
+
+/// A new text of `length` characters, copied from `text` unless that is null.
+DCM_API BSTR SysAllocStringLen(const wchar_t* text, UINT length) noexcept;
+
+/// Releases a text; null is allowed.
+DCM_API void SysFreeString(BSTR text) noexcept;
+
+/// The length of a text in characters, 0 for null.
+DCM_API UINT SysStringLen(const wchar_t* text) noexcept;

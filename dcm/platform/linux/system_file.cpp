@@ -1,0 +1,173 @@
+#include "dcm/platform/system_file.h"
+
+#include "dcm/platform/codepage.h"
+
+#include <cerrno>
+#include <fcntl.h>
+#include <sys/file.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace dcm::system {
+
+namespace {
+
+constexpr off_t kTooLarge = off_t{1} << 31;
+
+/// Closes the file again unless opening it came to a good end.
+class OpeningFile
+{
+public:
+    explicit OpeningFile(int file) : m_file(file) {}
+    OpeningFile(const OpeningFile&) = delete;
+    OpeningFile& operator=(const OpeningFile&) = delete;
+    ~OpeningFile()
+    {
+        if (m_file >= 0)
+            close(m_file);
+    }
+
+    int Get() const { return m_file; }
+    int Release()
+    {
+        const int file = m_file;
+        m_file = -1;
+        return file;
+    }
+
+private:
+    int m_file;
+};
+
+/// Locks the whole file without waiting. Where the file system has no such locks, the file is used
+/// without one.
+bool Lock(int file)
+{
+    while (flock(file, LOCK_EX | LOCK_NB) != 0) {
+        if (errno != EINTR)
+            return errno != EWOULDBLOCK;
+    }
+    return true;
+}
+
+} // namespace
+
+FileHandle OpenFile(const CString& path, UINT flags, long& error, CFileException::Cause& refusal)
+{
+    const int access = (flags & CFile::modeWrite) != 0       ? O_WRONLY
+                       : (flags & CFile::modeReadWrite) != 0 ? O_RDWR
+                                                             : O_RDONLY;
+    const int creation = (flags & CFile::modeCreate) != 0 ? O_CREAT : 0;
+    // A pipe without its other end would keep a blocking open waiting.
+    const int always = O_CLOEXEC | O_NOCTTY | O_NONBLOCK;
+    constexpr mode_t kReadWriteForAll = 0666;
+    OpeningFile file(open(ToUtf8(path).c_str(), access | creation | always, kReadWriteForAll));
+    struct stat status = {};
+    if (file.Get() < 0 || fstat(file.Get(), &status) != 0) {
+        error = errno;
+        return kNoFile;
+    }
+    if (S_ISDIR(status.st_mode)) {
+        error = EISDIR;
+        return kNoFile;
+    }
+    // A character device such as /dev/full is written to like a file; nobody owns it.
+    if (!S_ISREG(status.st_mode)) {
+        if (S_ISCHR(status.st_mode))
+            return file.Release();
+        refusal = CFileException::accessDenied;
+        return kNoFile;
+    }
+    if (status.st_size >= kTooLarge) {
+        refusal = CFileException::fileTooLarge;
+        return kNoFile;
+    }
+    if (!Lock(file.Get())) {
+        error = EWOULDBLOCK;
+        return kNoFile;
+    }
+    // Only now: a file that somebody else uses keeps its content.
+    if (creation != 0 && access != O_RDONLY && ftruncate(file.Get(), 0) != 0) {
+        error = errno;
+        return kNoFile;
+    }
+    return file.Release();
+}
+
+long FileLength(FileHandle file, std::uint64_t& length) noexcept
+{
+    struct stat status = {};
+    if (fstat(static_cast<int>(file), &status) != 0)
+        return errno;
+    length = static_cast<std::uint64_t>(status.st_size);
+    return 0;
+}
+
+long ReadSome(FileHandle file, void* buffer, std::size_t count, std::size_t& done) noexcept
+{
+    for (;;) {
+        const ssize_t got = read(static_cast<int>(file), buffer, count);
+        if (got >= 0) {
+            done = static_cast<std::size_t>(got);
+            return 0;
+        }
+        if (errno != EINTR)
+            return errno;
+    }
+}
+
+long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size_t& done) noexcept
+{
+    for (;;) {
+        const ssize_t put = write(static_cast<int>(file), buffer, count);
+        if (put >= 0) {
+            done = static_cast<std::size_t>(put);
+            return 0;
+        }
+        if (errno != EINTR)
+            return errno;
+    }
+}
+
+long CloseFile(FileHandle file) noexcept
+{
+    // After an interrupted close the file is closed all the same.
+    return close(static_cast<int>(file)) == 0 || errno == EINTR ? 0 : errno;
+}
+
+CFileException::Cause CauseOf(long error) noexcept
+{
+    switch (error) {
+    case ENOENT:
+        return CFileException::fileNotFound;
+    case ENOTDIR:
+    case ENAMETOOLONG:
+    case ELOOP:
+        return CFileException::badPath;
+    case EMFILE:
+    case ENFILE:
+        return CFileException::tooManyOpenFiles;
+    case EACCES:
+    case EPERM:
+    case EROFS:
+    case EISDIR:
+    case ETXTBSY:
+        return CFileException::accessDenied;
+    case EBADF:
+        return CFileException::invalidFile;
+    case EIO:
+        return CFileException::hardIO;
+    case EWOULDBLOCK:
+        return CFileException::sharingViolation;
+    case ENOSPC:
+    case EDQUOT:
+        return CFileException::diskFull;
+    case EFBIG:
+    case EOVERFLOW:
+        return CFileException::fileTooLarge;
+    default:
+        return CFileException::generic;
+    }
+}
+
+} // namespace dcm::system
