@@ -1,0 +1,54 @@
+#pragma once
+
+#include "dcm/library/export.h"
+#include "dcm/platform/cfile.h"
+#include "dcm/platform/codepage.h"
+#include "dcm/platform/cstring.h"
+
+#include <cstdint>
+#include <string_view>
+
+/// A text file in the ANSI code page: read as a whole and handed out line by line, or written text
+/// by text with CR LF line ends.
+///
+/// The content ends at the first zero byte. Only a line feed ends a line; text behind the last one
+/// is not handed out. A byte-order mark is text like any other.
+class DCM_API PravFile : public CFile
+{
+public:
+    /// No open file, no content.
+    PravFile() noexcept;
+    /// Opens the file and, unless `flags` has the write flag, loads its text. Throws
+    /// `CFileException` when that fails.
+    PravFile(const CString& path, UINT flags);
+    ~PravFile() override;
+
+    /// The same for an object that is there already. Returns what opening the file came to; a
+    /// failed read is thrown.
+    BOOL Open(const wchar_t* path, UINT flags, CFileException* error = nullptr) override;
+
+    /// Hands out the next line without its line end: 1, or 0 and an empty line when there is none.
+    int ReadLine(CString& line);
+
+    /// Hands out the lines up to the next empty one, each followed by one line feed; an empty
+    /// block where two empty lines meet. Returns false, with what is left in `block`, when no
+    /// further empty line follows.
+    bool ReadBlock(CString& block);
+
+    /// Writes `text` at the file's position in one piece: each line feed, with or without a
+    /// carriage return before it, as CR LF, and characters that the thread's code page lacks as
+    /// `?`. Returns 1; throws `CFileException` when not all of it could be written.
+    int WriteText(const CString& text);
+
+protected:
+    void LoadContent(UINT flags);
+
+private:
+    /// Cuts the next line off, without its line feed and the carriage returns before that.
+    bool TakeLine(std::string_view& line);
+
+    /// The bytes as they stand in the file: wide text takes four times the memory, so each line is
+    /// widened when it is handed out.
+    dcm::FileText m_content;
+    std::int32_t m_nReadPos;
+};
