@@ -1,0 +1,42 @@
+#pragma once
+
+#include "dcm/platform/text.h"
+
+#include <string_view>
+
+/// Reading the text of one block.
+namespace dcm {
+
+/// One line of a block: its keyword, and all that follows the first blank behind it.
+struct BlockLine
+{
+    std::wstring_view keyword;
+    std::wstring_view rest;
+
+    bool Is(std::wstring_view other) const { return EqualsNoCase(keyword, other); }
+};
+
+/// Walks over the lines of a block that have a keyword and a blank. White space in front of a line
+/// does not count, text behind the last line feed is not read, and a block that begins with a line
+/// feed has no lines.
+class BlockLines
+{
+public:
+    explicit BlockLines(std::wstring_view block);
+
+    /// Takes the next such line. False at the end.
+    bool Next(BlockLine& line);
+
+private:
+    std::wstring_view m_left;
+};
+
+/// Takes the name, the text before the first blank, off `rest`, which keeps what follows without
+/// white space at its ends. Without a blank there is no name and `rest` keeps all of it. White
+/// space in front is the caller's matter.
+std::wstring_view TakeName(std::wstring_view& rest);
+
+/// `rest` without the blanks and double quotes at both ends, in any mix.
+std::wstring_view Unquoted(std::wstring_view rest);
+
+} // namespace dcm

@@ -1,0 +1,80 @@
+#pragma once
+
+#include "dcm/platform/cstring.h"
+
+#include <concepts>
+#include <string>
+#include <string_view>
+
+/// Composing the text of one block, line by line; each line ends in one line feed.
+namespace dcm {
+
+/// Appends the indent and the keyword.
+void BeginLine(CString& block, std::wstring_view keyword);
+
+/// Appends an indented line: keyword, blank, value.
+void AppendLine(CString& block, std::wstring_view keyword, std::wstring_view value);
+
+/// Appends an indented line: keyword, blank, value in double quotes. Nothing is escaped.
+void AppendQuotedLine(CString& block, std::wstring_view keyword, std::wstring_view value);
+
+/// Appends the line of a unit: none for an empty unit; a unit of one blank stands for a line with
+/// an empty unit.
+void AppendUnitLine(CString& block, std::wstring_view keyword, std::wstring_view unit);
+
+/// What export does to a unit of one blank once its line is written: it becomes empty.
+void DropBlankUnit(CString& unit);
+
+/// Appends the not indented line that names a shared distribution; none for an empty name.
+void AppendSharedAxisLine(CString& block, std::wstring_view keyword, std::wstring_view name);
+
+/// Appends " " and the decimal number.
+template <std::integral Count>
+void AppendCount(CString& block, Count count)
+{
+    block.Append(L" ").Append(std::to_wstring(count));
+}
+
+/// Appends "END" and the empty line without which a reader drops the block.
+void AppendEnd(CString& block);
+
+/// How a text is written among others on a line.
+struct TextItemStyle
+{
+    /// Characters that would break the line; each is written as a full stop.
+    std::wstring_view replaced;
+    /// What follows the closing quote.
+    std::wstring_view trailer;
+};
+
+/// Appends a blank and the text in double quotes. Nothing is escaped.
+void AppendQuotedText(CString& block, std::wstring_view text, const TextItemStyle& style);
+
+/// Composes lines of values: as many items to a line as fit, under the keyword of the first.
+class ItemLines
+{
+public:
+    ItemLines(CString& block, int itemsPerLine) : m_block(block), m_itemsPerLine(itemsPerLine) {}
+
+    void AddNumber(std::wstring_view keyword, double number, int digits);
+    void AddText(std::wstring_view keyword, std::wstring_view text, const TextItemStyle& style);
+    /// Ends a line that is not full; what follows begins a new one.
+    void EndLine();
+
+private:
+    void BeginItem(std::wstring_view keyword);
+    void EndItem();
+
+    CString& m_block;
+    int m_itemsPerLine;
+    int m_items = 0;
+};
+
+/// Items on a line of points or values, but for the rows of a two-dimensional value block.
+inline constexpr int kItemsPerLine = 5;
+
+/// Significant digits that bring every number back, and those of a two-dimensional value block.
+inline constexpr int kFullDigits = 17;
+inline constexpr int kShortDigits = 15;
+
+} // namespace dcm

@@ -1,0 +1,188 @@
+#include "dcm/elements/kennfeld.h"
+
+#include "dcm/elements/block_lines.h"
+#include "dcm/elements/block_text.h"
+#include "dcm/elements/keywords.h"
+#include "dcm/elements/number.h"
+#include "dcm/elements/points.h"
+#include "dcm/platform/text.h"
+#include "dcm/textfile/pravfile.h"
+
+#include <algorithm>
+#include <span>
+#include <utility>
+
+DCMKennfeld::DCMKennfeld()
+    : m_strKeyword(dcm::keyword::kKennfeld), m_vtValueType(VT_EMPTY), m_vtAxisXType(VT_EMPTY),
+      m_vtAxisYType(VT_EMPTY), m_nAxisLengthX(0), m_nAxisLengthY(0)
+{}
+
+DCMKennfeld& DCMKennfeld::operator=(const DCMKennfeld& other)
+{
+    DCMKennfeld copy(other);
+    return *this = std::move(copy);
+}
+
+DCMKennfeld::~DCMKennfeld() = default;
+
+HRESULT DCMKennfeld::Init(const CString& strBlock)
+{
+    dcm::BlockLines lines(strBlock);
+    dcm::BlockLine line;
+    while (lines.Next(line)) {
+        if (line.Is(m_strKeyword))
+            ReadFirstLine(dcm::TrimWhite(line.rest), strBlock);
+        else if (ReadAttribute(line.keyword, dcm::Unquoted(line.rest), line.rest))
+            continue;
+        else if (line.Is(dcm::keyword::kEinheitX))
+            m_strUnitX = dcm::Unquoted(line.rest);
+        else if (line.Is(dcm::keyword::kEinheitY))
+            m_strUnitY = dcm::Unquoted(line.rest);
+        else if (line.Is(dcm::keyword::kEinheitW))
+            m_strUnitW = dcm::Unquoted(line.rest);
+        else if (line.Is(dcm::keyword::kSstX))
+            m_strStuetzstellenverteilungX = dcm::Trim(line.rest, L" ");
+        else if (line.Is(dcm::keyword::kSstY))
+            m_strStuetzstellenverteilungY = dcm::Trim(line.rest, L" ");
+        else
+            AddValues(line.rest, line.keyword);
+    }
+    return S_OK;
+}
+
+/// The name, the count of the X axis and that of the Y axis. Where a word is missing, it is the
+/// one in front.
+void DCMKennfeld::ReadFirstLine(std::wstring_view rest, std::wstring_view block)
+{
+    SetName(dcm::TakeName(rest));
+    m_nAxisLengthX = dcm::ReadInteger(dcm::TakeName(rest));
+    m_nAxisLengthY = dcm::ReadInteger(rest);
+    dcm::ReservePoints(m_vecAxisX, m_nAxisLengthX, block);
+    dcm::ReservePoints(m_vecAxisY, m_nAxisLengthY, block);
+    dcm::ReservePoints(m_vecValues, std::int64_t{m_nAxisLengthX} * m_nAxisLengthY, block);
+}
+
+HRESULT DCMKennfeld::AddValues(std::wstring_view rest, std::wstring_view keyword)
+{
+    const dcm::PointTarget targets[] = {
+        {dcm::kValues, {m_vecValues, m_vtValueType}},
+        {dcm::kAxisX, {m_vecAxisX, m_vtAxisXType}},
+        {dcm::kAxisY, {m_vecAxisY, m_vtAxisYType}},
+    };
+    dcm::ReadPointLine(keyword, rest, targets);
+    return S_OK;
+}
+
+HRESULT DCMKennfeld::Export(PravFile& file)
+{
+    const CString block = BlockText();
+    dcm::DropBlankUnit(m_strUnitX);
+    dcm::DropBlankUnit(m_strUnitY);
+    dcm::DropBlankUnit(m_strUnitW);
+    file.WriteText(block);
+    return S_OK;
+}
+
+/// The whole block; empty when it has no lines of points or values.
+CString DCMKennfeld::BlockText() const
+{
+    CString block = m_strKeyword;
+    block.Append(L" ").Append(GetName());
+    const auto appendCount = [&](std::int32_t axisLength, std::size_t points) {
+        if (axisLength > 0)
+            dcm::AppendCount(block, axisLength);
+        else
+            dcm::AppendCount(block, points);
+    };
+    appendCount(m_nAxisLengthX, m_vecAxisX.size());
+    appendCount(m_nAxisLengthY, m_vecAxisY.size());
+    block.Append(L"\n");
+    AppendAttributes(block);
+    dcm::AppendUnitLine(block, dcm::keyword::kEinheitX, m_strUnitX);
+    dcm::AppendUnitLine(block, dcm::keyword::kEinheitY, m_strUnitY);
+    dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnitW);
+    dcm::AppendSharedAxisLine(block, dcm::keyword::kSstX, m_strSharedXAxisUniqueName);
+    dcm::AppendSharedAxisLine(block, dcm::keyword::kSstY, m_strSharedYAxisUniqueName);
+    const int head = block.GetLength();
+    AppendValues(block);
+    if (block.GetLength() == head)
+        return {};
+    dcm::AppendEnd(block);
+    return block;
+}
+
+CString DCMKennfeld::ExportValues(PravFile&) const
+{
+    CString lines;
+    AppendValues(lines);
+    return lines;
+}
+
+void DCMKennfeld::AppendValues(CString& block) const
+{
+    const std::size_t width = m_vecAxisX.size();
+    if (width * m_vecAxisY.size() > m_vecValues.size())
+        return;
+    dcm::PointLines(block, dcm::kAxisX).AddGroup(m_vecAxisX);
+    dcm::PointLines axisY(block, dcm::kAxisY);
+    dcm::PointLines values(block, dcm::kValues);
+    std::span<const CComVariant> left(m_vecValues);
+    for (const CComVariant& point : m_vecAxisY) {
+        axisY.AddGroup({&point, 1});
+        values.AddGroup(left.first(width));
+        left = left.subspan(width);
+    }
+}
+
+HRESULT DCMKennfeld::AddValue(VARIANT value)
+{
+    dcm::AppendPoint({m_vecValues, m_vtValueType}, value);
+    return S_OK;
+}
+
+HRESULT DCMKennfeld::AddAxisX(VARIANT value)
+{
+    dcm::AppendPoint({m_vecAxisX, m_vtAxisXType}, value);
+    return S_OK;
+}
+
+HRESULT DCMKennfeld::AddAxisY(VARIANT value)
+{
+    dcm::AppendPoint({m_vecAxisY, m_vtAxisYType}, value);
+    return S_OK;
+}
+
+HRESULT DCMKennfeld::GetAxis_X(std::vector<CComVariant>& axis) const
+{
+    dcm::CopyPoints(m_vecAxisX, axis);
+    return S_OK;
+}
+
+HRESULT DCMKennfeld::GetAxis_Y(std::vector<CComVariant>& axis) const
+{
+    dcm::CopyPoints(m_vecAxisY, axis);
+    return S_OK;
+}
+
+HRESULT DCMKennfeld::GetValues(std::vector<CComVariant>& values) const
+{
+    dcm::CopyPoints(m_vecValues, values);
+    return S_OK;
+}
+
+void DCMKennfeld::RotateMap()
+{}
+
+DCMFestkennfeld::DCMFestkennfeld()
+{
+    m_strKeyword = CString(dcm::keyword::kFestkennfeld);
+}
+
+DCMFestkennfeld::~DCMFestkennfeld() = default;
+
+DCMGruppenkennfeld::DCMGruppenkennfeld()
+{
+    m_strKeyword = CString(dcm::keyword::kGruppenkennfeld);
+}
+
+DCMGruppenkennfeld::~DCMGruppenkennfeld() = default;

@@ -1,0 +1,152 @@
+#pragma once
+
+#include "dcm/elements/basetype.h"
+#include "dcm/library/export.h"
+#include "dcm/platform/automation.h"
+#include "dcm/platform/cstring.h"
+#include "dcm/platform/variant.h"
+
+#include <cstdint>
+#include <string_view>
+#include <vector>
+
+/// One KENNFELD: a map of values over the points of two axes, each of the three with a unit.
+///
+/// The values stand row by row: first the row of the first Y axis point, with one value for each X
+/// axis point, then that of the second. The value at X index i and Y index j has the index
+/// j * (number of X axis points) + i.
+///
+/// Each array has one type: the tag of its first item. From the first item of another tag on, the
+/// type and each further item are `VT_ERROR` without a value; such items keep their place but are
+/// not written.
+class DCM_API DCMKennfeld : public DCMBaseType
+{
+public:
+    /// Empty texts, no points, axis lengths 0.
+    DCMKennfeld();
+    /// Copies take the keyword along and have texts of their own.
+    DCMKennfeld(const DCMKennfeld&) = default;
+    DCMKennfeld(DCMKennfeld&&) noexcept = default;
+    /// The map is as it was when memory runs out.
+    DCMKennfeld& operator=(const DCMKennfeld& other);
+    DCMKennfeld& operator=(DCMKennfeld&&) noexcept = default;
+    ~DCMKennfeld() override;
+
+    /// Reads one block from its lines, each ended by one line feed, and appends to the points
+    /// already held, values in the order of their lines. Unknown lines and items of the wrong kind
+    /// are skipped; a number that cannot be read becomes 0. The first line is a name and two
+    /// counts; a single count is that of the Y axis, and without any the name is empty. Returns 0.
+    HRESULT Init(const CString& strBlock);
+
+    /// Writes the block in one piece: the X axis, then each Y axis point with its row, five items
+    /// a line; only numbers (`VT_R8`) and texts are written, and only one value for each pair of
+    /// axis points. Nothing at all is written when the values are too few for the axes. The counts
+    /// on the first line are the axis lengths where greater than 0, otherwise the numbers of axis
+    /// points. Line ends, tabs and backspaces in texts become full stops. A unit of one blank is
+    /// written as an empty one and is empty afterwards. Returns 0; a failed write is thrown as
+    /// `CFileException`.
+    HRESULT Export(PravFile& file);
+
+    /// Appends a copy of one value or axis point: `VT_R8`, `VT_R4` and `VT_BSTR` keep their value.
+    /// Returns 0.
+    HRESULT AddValue(VARIANT value);
+    HRESULT AddAxisX(VARIANT value);
+    HRESULT AddAxisY(VARIANT value);
+    /// Replaces the content of the array by copies, in order; texts are the array's own and go
+    /// with it. Returns 0.
+    HRESULT GetAxis_X(std::vector<CComVariant>& axis) const;
+    HRESULT GetAxis_Y(std::vector<CComVariant>& axis) const;
+    HRESULT GetValues(std::vector<CComVariant>& values) const;
+    /// The common tag of the items; 0 while there is none, `VT_ERROR` when they differ.
+    VARTYPE GetAxis_XType() const { return m_vtAxisXType; }
+    VARTYPE GetAxis_YType() const { return m_vtAxisYType; }
+    VARTYPE GetValueType() const { return m_vtValueType; }
+
+    /// The counts on the first line. They are not compared with the points.
+    std::int32_t GetAxisLenghtX() const { return m_nAxisLengthX; }
+    std::int32_t GetAxisLenghtY() const { return m_nAxisLengthY; }
+    void SetAxisLenghtX(std::int32_t nLength) { m_nAxisLengthX = nLength; }
+    void SetAxisLenghtY(std::int32_t nLength) { m_nAxisLengthY = nLength; }
+
+    /// Texts of EINHEIT_X, EINHEIT_Y and EINHEIT_W as they stand in the file, not interpreted; may
+    /// be empty. The references stay valid as long as the block and may be written through.
+    CString& GetUnit_X() { return m_strUnitX; }
+    const CString& GetUnit_X() const { return m_strUnitX; }
+    CString& GetUnit_Y() { return m_strUnitY; }
+    const CString& GetUnit_Y() const { return m_strUnitY; }
+    CString& GetUnit_W() { return m_strUnitW; }
+    const CString& GetUnit_W() const { return m_strUnitW; }
+    void SetUnit_X(const CString& strUnit) { m_strUnitX = strUnit; }
+    void SetUnit_Y(const CString& strUnit) { m_strUnitY = strUnit; }
+    void SetUnit_W(const CString& strUnit) { m_strUnitW = strUnit; }
+
+    /// The distributions that the written block names on its *SSTX and *SSTY lines; no line where
+    /// empty. What was read is not written unless it is set here.
+    void SetSharedXAxisUniqueName(const CString& strName) { m_strSharedXAxisUniqueName = strName; }
+    void SetSharedYAxisUniqueName(const CString& strName) { m_strSharedYAxisUniqueName = strName; }
+    /// The distributions that the block read from a file names; empty where it names none.
+    CString GetStuetzstellenverteilungX() const { return m_strStuetzstellenverteilungX; }
+    CString GetStuetzstellenverteilungY() const { return m_strStuetzstellenverteilungY; }
+
+    /// Does nothing; the map keeps its orientation.
+    void RotateMap();
+
+protected:
+    /// Reads what follows the keyword of one line of points or values. Returns 0.
+    HRESULT AddValues(std::wstring_view rest, std::wstring_view keyword);
+    /// The lines of points and values; empty when the values are too few for the axes. The file is
+    /// not written to.
+    CString ExportValues(PravFile& file) const;
+
+private:
+    friend class DCMConverter;
+    void ReadFirstLine(std::wstring_view rest, std::wstring_view block);
+    CString BlockText() const;
+    void AppendValues(CString& block) const;
+
+    CString m_strUnitX;
+    CString m_strUnitY;
+    CString m_strUnitW;
+
+protected:
+    /// The first word of the block.
+    CString m_strKeyword;
+
+private:
+    CString m_strSharedXAxisUniqueName;
+    CString m_strSharedYAxisUniqueName;
+    std::vector<CComVariant> m_vecAxisX;
+    std::vector<CComVariant> m_vecAxisY;
+    std::vector<CComVariant> m_vecValues;
+    VARTYPE m_vtValueType;
+    VARTYPE m_vtAxisXType;
+    VARTYPE m_vtAxisYType;
+    std::int32_t m_nAxisLengthX;
+    std::int32_t m_nAxisLengthY;
+    CString m_strStuetzstellenverteilungX;
+    CString m_strStuetzstellenverteilungY;
+};
+
+/// One FESTKENNFELD: the same under another keyword.
+class DCM_API DCMFestkennfeld : public DCMKennfeld
+{
+public:
+    DCMFestkennfeld();
+    DCMFestkennfeld(const DCMFestkennfeld&) = default;
+    DCMFestkennfeld(DCMFestkennfeld&&) noexcept = default;
+    DCMFestkennfeld& operator=(const DCMFestkennfeld&) = default;
+    DCMFestkennfeld& operator=(DCMFestkennfeld&&) noexcept = default;
+    ~DCMFestkennfeld() override;
+};
+
+/// One GRUPPENKENNFELD: a map over the axes of distributions.
+class DCM_API DCMGruppenkennfeld : public DCMKennfeld
+{
+public:
+    DCMGruppenkennfeld();
+    DCMGruppenkennfeld(const DCMGruppenkennfeld&) = default;
+    DCMGruppenkennfeld(DCMGruppenkennfeld&&) noexcept = default;
+    DCMGruppenkennfeld& operator=(const DCMGruppenkennfeld&) = default;
+    DCMGruppenkennfeld& operator=(DCMGruppenkennfeld&&) noexcept = default;
+    ~DCMGruppenkennfeld() override;
+};

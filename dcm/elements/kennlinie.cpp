@@ -1,0 +1,145 @@
+#include "dcm/elements/kennlinie.h"
+
+#include "dcm/elements/block_lines.h"
+#include "dcm/elements/block_text.h"
+#include "dcm/elements/keywords.h"
+#include "dcm/elements/number.h"
+#include "dcm/elements/points.h"
+#include "dcm/platform/text.h"
+#include "dcm/textfile/pravfile.h"
+
+#include <utility>
+
+DCMKennlinie::DCMKennlinie()
+    : m_strKeyword(dcm::keyword::kKennlinie), m_vtValueType(VT_EMPTY), m_vtAxisType(VT_EMPTY),
+      m_nAxisLengthX(0)
+{}
+
+DCMKennlinie& DCMKennlinie::operator=(const DCMKennlinie& other)
+{
+    DCMKennlinie copy(other);
+    return *this = std::move(copy);
+}
+
+DCMKennlinie::~DCMKennlinie() = default;
+
+HRESULT DCMKennlinie::Init(const CString& strBlock)
+{
+    dcm::BlockLines lines(strBlock);
+    dcm::BlockLine line;
+    while (lines.Next(line)) {
+        if (line.Is(m_strKeyword))
+            ReadFirstLine(dcm::TrimWhite(line.rest), strBlock);
+        else if (ReadAttribute(line.keyword, dcm::Unquoted(line.rest), line.rest))
+            continue;
+        else if (line.Is(dcm::keyword::kEinheitX))
+            m_strUnitX = dcm::Unquoted(line.rest);
+        else if (line.Is(dcm::keyword::kEinheitW))
+            m_strUnitW = dcm::Unquoted(line.rest);
+        else if (line.Is(dcm::keyword::kStTxY))
+            return E_FAIL;
+        else if (line.Is(dcm::keyword::kSstX))
+            m_strStuetzstellenverteilung = dcm::Trim(line.rest, L" ");
+        else
+            AddValues(line.rest, line.keyword);
+    }
+    return S_OK;
+}
+
+/// The name and the count behind it; a line of one word is the count.
+void DCMKennlinie::ReadFirstLine(std::wstring_view rest, std::wstring_view block)
+{
+    SetName(dcm::TakeName(rest));
+    m_nAxisLengthX = dcm::ReadInteger(rest);
+    dcm::ReservePoints(m_vecAxis, m_nAxisLengthX, block);
+    dcm::ReservePoints(m_vecValues, m_nAxisLengthX, block);
+}
+
+HRESULT DCMKennlinie::AddValues(std::wstring_view rest, std::wstring_view keyword)
+{
+    const dcm::PointTarget targets[] = {
+        {dcm::kAxisX, {m_vecAxis, m_vtAxisType}},
+        {dcm::kValues, {m_vecValues, m_vtValueType}},
+    };
+    dcm::ReadPointLine(keyword, rest, targets);
+    return S_OK;
+}
+
+HRESULT DCMKennlinie::Export(PravFile& file)
+{
+    const CString block = BlockText();
+    dcm::DropBlankUnit(m_strUnitX);
+    dcm::DropBlankUnit(m_strUnitW);
+    file.WriteText(block);
+    return S_OK;
+}
+
+CString DCMKennlinie::BlockText() const
+{
+    CString block = m_strKeyword;
+    block.Append(L" ").Append(GetName());
+    if (m_nAxisLengthX > 0)
+        dcm::AppendCount(block, m_nAxisLengthX);
+    else
+        dcm::AppendCount(block, m_vecValues.size());
+    block.Append(L"\n");
+    AppendAttributes(block);
+    dcm::AppendUnitLine(block, dcm::keyword::kEinheitX, m_strUnitX);
+    dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnitW);
+    dcm::AppendSharedAxisLine(block, dcm::keyword::kSstX, m_strSharedAxisUniqueName);
+    ExportValues(block);
+    dcm::AppendEnd(block);
+    return block;
+}
+
+void DCMKennlinie::ExportValues(CString& block) const
+{
+    dcm::PointLines(block, dcm::kAxisX).AddGroup(m_vecAxis);
+    dcm::PointLines(block, dcm::kValues).AddGroup(m_vecValues);
+}
+
+HRESULT DCMKennlinie::AddValue(VARIANT value)
+{
+    dcm::AppendPoint({m_vecValues, m_vtValueType}, value);
+    return S_OK;
+}
+
+HRESULT DCMKennlinie::AddAxis(VARIANT value)
+{
+    dcm::AppendPoint({m_vecAxis, m_vtAxisType}, value);
+    return S_OK;
+}
+
+HRESULT DCMKennlinie::GetAxis(std::vector<CComVariant>& axis) const
+{
+    dcm::CopyPoints(m_vecAxis, axis);
+    return S_OK;
+}
+
+HRESULT DCMKennlinie::GetValues(std::vector<CComVariant>& values) const
+{
+    dcm::CopyPoints(m_vecValues, values);
+    return S_OK;
+}
+
+void DCMKennlinie::AddValue(double dValue, const CString& strKeyword)
+{
+    if (strKeyword == dcm::keyword::kStX)
+        m_listAxis.push_back(dValue);
+    else if (strKeyword == dcm::keyword::kWert)
+        m_listValues.push_back(dValue);
+}
+
+DCMFestkennlinie::DCMFestkennlinie()
+{
+    m_strKeyword = CString(dcm::keyword::kFestkennlinie);
+}
+
+DCMFestkennlinie::~DCMFestkennlinie() = default;
+
+DCMGruppenkennlinie::DCMGruppenkennlinie()
+{
+    m_strKeyword = CString(dcm::keyword::kGruppenkennlinie);
+}
+
+DCMGruppenkennlinie::~DCMGruppenkennlinie() = default;

@@ -1,0 +1,33 @@
+#include "dcm/elements/konservierungsformat.h"
+
+#include "dcm/elements/block_lines.h"
+#include "dcm/elements/keywords.h"
+#include "dcm/elements/number.h"
+#include "dcm/platform/text.h"
+#include "dcm/textfile/pravfile.h"
+
+#include <string_view>
+
+DCMKonservierungsFormat::DCMKonservierungsFormat() : m_dValue(0.0)
+{}
+
+DCMKonservierungsFormat::~DCMKonservierungsFormat() = default;
+
+HRESULT DCMKonservierungsFormat::Init(const CString& strBlock)
+{
+    const std::wstring_view text = strBlock;
+    const std::size_t blank = text.find(L' ');
+    if (blank == text.npos)
+        return S_OK;
+    if (dcm::EqualsNoCase(text.substr(0, blank), dcm::keyword::kKonservierungFormat))
+        m_dValue = dcm::ReadNumber(dcm::Unquoted(text.substr(blank + 1)));
+    return S_OK;
+}
+
+HRESULT DCMKonservierungsFormat::Export(PravFile& file) const
+{
+    CString line(dcm::keyword::kKonservierungFormat);
+    line += L" 2.0\n\n";
+    file.WriteText(line);
+    return S_OK;
+}

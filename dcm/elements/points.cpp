@@ -1,0 +1,116 @@
+#include "dcm/elements/points.h"
+
+#include "dcm/elements/number.h"
+#include "dcm/platform/text.h"
+
+#include <algorithm>
+#include <utility>
+
+namespace dcm {
+
+namespace {
+
+/// Besides line ends, the characters that a value block leaves as they are.
+constexpr TextItemStyle kPointText = {L"\n\r\t\b", L" "};
+
+VARTYPE TypeWith(VARTYPE type, VARTYPE added)
+{
+    if (type == VT_EMPTY || type == added)
+        return added;
+    return VT_ERROR;
+}
+
+void ReadNumbers(std::wstring_view rest, const PointArray& array)
+{
+    bool more = !rest.empty();
+    while (more) {
+        double number = 0;
+        more = TakeNumber(rest, number);
+        if (array.type == VT_R8)
+            array.points.emplace_back(number);
+        else
+            AppendPoint(array, CComVariant(number));
+    }
+}
+
+/// A text begins behind an opening quote, which is whatever follows the text before it, and ends at
+/// the next quote or with the line.
+void ReadTexts(std::wstring_view rest, const PointArray& array)
+{
+    while (!rest.empty()) {
+        rest.remove_prefix(1);
+        const std::size_t end = rest.find(L'"');
+        const std::wstring_view text = rest.substr(0, end);
+        rest = end == rest.npos ? std::wstring_view() : TrimWhite(rest.substr(end + 1));
+        AppendPoint(array, CComVariant(text));
+    }
+}
+
+} // namespace
+
+void AppendPoint(const PointArray& array, const VARIANT& point)
+{
+    const VARTYPE type = TypeWith(array.type, point.vt);
+    if (type == VT_R8 || type == VT_R4 || type == VT_BSTR) {
+        array.points.emplace_back(point);
+    } else {
+        CComVariant withoutValue;
+        withoutValue.vt = type;
+        array.points.push_back(std::move(withoutValue));
+    }
+    array.type = type;
+}
+
+void ReservePoints(std::vector<CComVariant>& points, long long count, std::wstring_view block)
+{
+    // The shortest item is a digit and a blank. An array in use grows by itself: room made time
+    // and again would copy it each time.
+    const auto most = static_cast<long long>(block.size() / 2);
+    if (points.empty() && count > 0)
+        points.reserve(static_cast<std::size_t>(std::min(count, most)));
+}
+
+void ReadPoints(std::wstring_view rest, const PointArray* numbers, const PointArray* texts)
+{
+    rest = TrimWhite(rest);
+    if (rest.starts_with(L'"') && rest.ends_with(L'"')) {
+        if (texts != nullptr)
+            ReadTexts(rest, *texts);
+    } else if (numbers != nullptr) {
+        ReadNumbers(rest, *numbers);
+    }
+}
+
+void ReadPointLine(std::wstring_view keyword, std::wstring_view rest,
+                   std::span<const PointTarget> targets)
+{
+    for (const PointTarget& target : targets) {
+        if (EqualsNoCase(keyword, target.keywords.numbers))
+            return ReadPoints(rest, &target.array, nullptr);
+        if (EqualsNoCase(keyword, target.keywords.texts))
+            return ReadPoints(rest, nullptr, &target.array);
+    }
+}
+
+void CopyPoints(const std::vector<CComVariant>& points, std::vector<CComVariant>& target)
+{
+    std::vector<CComVariant> copy(points);
+    target.swap(copy);
+}
+
+void PointLines::Add(const VARIANT& point)
+{
+    if (point.vt == VT_R8)
+        m_lines.AddNumber(m_keywords.numbers, point.dblVal, kFullDigits);
+    else if (point.vt == VT_BSTR)
+        m_lines.AddText(m_keywords.texts, CComVariant::TextOf(point), kPointText);
+}
+
+void PointLines::AddGroup(std::span<const CComVariant> points)
+{
+    for (const CComVariant& point : points)
+        Add(point);
+    m_lines.EndLine();
+}
+
+} // namespace dcm

@@ -1,0 +1,81 @@
+#pragma once
+
+#include "dcm/elements/block_text.h"
+#include "dcm/elements/keywords.h"
+#include "dcm/platform/automation.h"
+#include "dcm/platform/cstring.h"
+#include "dcm/platform/variant.h"
+
+#include <span>
+#include <string_view>
+#include <vector>
+
+/// The typed arrays of points that distributions, curves and maps hold.
+namespace dcm {
+
+/// An array of points with its type: `VT_EMPTY` while it has none, the tag of the first point, and
+/// `VT_ERROR` for good from the first point of another tag on.
+struct PointArray
+{
+    std::vector<CComVariant>& points;
+    VARTYPE& type;
+};
+
+/// Appends a point under the array's type. Its value is kept for `VT_R8`, `VT_R4` and `VT_BSTR` (a
+/// text of its own); a point of any other type, `VT_ERROR` included, has no value.
+void AppendPoint(const PointArray& array, const VARIANT& point);
+
+/// Makes room for as many points as the block announces, but not for more than its text can hold.
+void ReservePoints(std::vector<CComVariant>& points, long long count, std::wstring_view block);
+
+/// Reads the items of one point line: quoted texts when it begins and ends with a double quote,
+/// numbers otherwise. Items of a kind without an array are dropped.
+void ReadPoints(std::wstring_view rest, const PointArray* numbers, const PointArray* texts);
+
+/// Replaces `target` by copies of the points, each text its own; leaves it as it was when memory
+/// runs out.
+void CopyPoints(const std::vector<CComVariant>& points, std::vector<CComVariant>& target);
+
+/// The keywords under which the points of one array are read and written.
+struct PointKeywords
+{
+    std::wstring_view numbers;
+    std::wstring_view texts;
+};
+
+inline constexpr PointKeywords kAxisX = {keyword::kStX, keyword::kStTxX};
+inline constexpr PointKeywords kAxisY = {keyword::kStY, keyword::kStTxY};
+inline constexpr PointKeywords kValues = {keyword::kWert, keyword::kText};
+
+/// An array and the keywords of its lines in the blocks of a curve or map, where numbers and texts
+/// have keywords of their own.
+struct PointTarget
+{
+    PointKeywords keywords;
+    PointArray array;
+};
+
+/// Reads one point line into the target whose keyword it has, if any. Numbers under the keyword of
+/// texts are dropped, and the reverse.
+void ReadPointLine(std::wstring_view keyword, std::wstring_view rest,
+                   std::span<const PointTarget> targets);
+
+/// Writes the points of an array five to a line; those that are neither number nor text take no
+/// place.
+class PointLines
+{
+public:
+    PointLines(CString& block, const PointKeywords& keywords)
+        : m_lines(block, kItemsPerLine), m_keywords(keywords)
+    {}
+
+    void Add(const VARIANT& point);
+    /// Adds the points and ends the line.
+    void AddGroup(std::span<const CComVariant> points);
+
+private:
+    ItemLines m_lines;
+    PointKeywords m_keywords;
+};
+
+} // namespace dcm

@@ -1,0 +1,95 @@
+#include "dcm/elements/stuetzstellenverteilung.h"
+
+#include "dcm/elements/block_lines.h"
+#include "dcm/elements/block_text.h"
+#include "dcm/elements/keywords.h"
+#include "dcm/elements/number.h"
+#include "dcm/elements/points.h"
+#include "dcm/platform/text.h"
+#include "dcm/textfile/pravfile.h"
+
+#include <utility>
+
+DCMStuetzstellenverteilung::DCMStuetzstellenverteilung() : m_vtValueType(VT_EMPTY)
+{}
+
+DCMStuetzstellenverteilung&
+DCMStuetzstellenverteilung::operator=(const DCMStuetzstellenverteilung& other)
+{
+    DCMStuetzstellenverteilung copy(other);
+    return *this = std::move(copy);
+}
+
+DCMStuetzstellenverteilung::~DCMStuetzstellenverteilung() = default;
+
+HRESULT DCMStuetzstellenverteilung::Init(const CString& strBlock)
+{
+    dcm::BlockLines lines(strBlock);
+    dcm::BlockLine line;
+    while (lines.Next(line)) {
+        if (line.Is(dcm::keyword::kStuetzstellenverteilung))
+            ReadFirstLine(dcm::TrimWhite(line.rest), strBlock);
+        else if (ReadAttribute(line.keyword, dcm::Unquoted(line.rest), line.rest))
+            continue;
+        else if (line.Is(dcm::keyword::kEinheitX))
+            m_strUnit = dcm::Unquoted(line.rest);
+        else if (line.Is(dcm::keyword::kStX) || line.Is(dcm::keyword::kStTxX))
+            AddValues(line.rest);
+        else if (line.Is(dcm::keyword::kStTxY) || line.Is(dcm::keyword::kText))
+            return E_FAIL;
+    }
+    return S_OK;
+}
+
+/// The name. The count behind it says how much room to make.
+void DCMStuetzstellenverteilung::ReadFirstLine(std::wstring_view rest, std::wstring_view block)
+{
+    SetName(dcm::TakeName(rest));
+    dcm::ReservePoints(m_vecValues, dcm::ReadInteger(rest), block);
+}
+
+/// Numbers and texts are told apart by the quotes alone.
+HRESULT DCMStuetzstellenverteilung::AddValues(std::wstring_view rest)
+{
+    const dcm::PointArray values{m_vecValues, m_vtValueType};
+    dcm::ReadPoints(rest, &values, &values);
+    return S_OK;
+}
+
+HRESULT DCMStuetzstellenverteilung::Export(PravFile& file)
+{
+    const CString block = BlockText();
+    dcm::DropBlankUnit(m_strUnit);
+    file.WriteText(block);
+    return S_OK;
+}
+
+CString DCMStuetzstellenverteilung::BlockText() const
+{
+    CString block(dcm::keyword::kStuetzstellenverteilung);
+    block.Append(L" ").Append(GetName());
+    dcm::AppendCount(block, m_vecValues.size());
+    block.Append(L"\n").Append(dcm::keyword::kSst).Append(L"\n");
+    AppendAttributes(block);
+    dcm::AppendUnitLine(block, dcm::keyword::kEinheitX, m_strUnit);
+    ExportValues(block);
+    dcm::AppendEnd(block);
+    return block;
+}
+
+void DCMStuetzstellenverteilung::ExportValues(CString& block) const
+{
+    dcm::PointLines(block, dcm::kAxisX).AddGroup(m_vecValues);
+}
+
+HRESULT DCMStuetzstellenverteilung::AddValue(CComVariant value)
+{
+    dcm::AppendPoint({m_vecValues, m_vtValueType}, value);
+    return S_OK;
+}
+
+HRESULT DCMStuetzstellenverteilung::GetValues(std::vector<CComVariant>& values) const
+{
+    dcm::CopyPoints(m_vecValues, values);
+    return S_OK;
+}
