@@ -1,0 +1,325 @@
+#include "dcm/converter/dcmconverter.h"
+
+#include "dcm/elements/keywords.h"
+#include "dcm/platform/text.h"
+#include "dcm/textfile/pravfile.h"
+
+#include <algorithm>
+#include <string_view>
+#include <utility>
+
+/// What belongs to one kind of block: how it comes in and how its list goes out.
+struct DCMConverter::BlockKind
+{
+    std::wstring_view keyword;
+    HRESULT (DCMConverter::*insert)(const CString& strBlock);
+    HRESULT (DCMConverter::*write)(PravFile& file) const;
+};
+
+/// The kinds in the order in which they are exported.
+const DCMConverter::BlockKind DCMConverter::kBlockKinds[] = {
+    {dcm::keyword::kFestwert, &DCMConverter::InsertFestwert, &DCMConverter::WriteFestwerte},
+    {dcm::keyword::kFestwerteblock, &DCMConverter::InsertFestwerteBlock,
+     &DCMConverter::WriteFestwerteblock},
+    {dcm::keyword::kStuetzstellenverteilung, &DCMConverter::InsertStuetzstellenverteilung,
+     &DCMConverter::WriteStuetzstellenverteilung},
+    {dcm::keyword::kKennlinie, &DCMConverter::InsertKennlinie, &DCMConverter::WriteKennlinie},
+    {dcm::keyword::kFestkennlinie, &DCMConverter::InsertFestKennlinie,
+     &DCMConverter::WriteFestKennlinie},
+    {dcm::keyword::kGruppenkennlinie, &DCMConverter::InsertGruppenKennlinie,
+     &DCMConverter::WriteGruppenKennlinie},
+    {dcm::keyword::kKennfeld, &DCMConverter::InsertKennfeld, &DCMConverter::WriteKennfeld},
+    {dcm::keyword::kFestkennfeld, &DCMConverter::InsertFestKennfeld,
+     &DCMConverter::WriteFestKennfeld},
+    {dcm::keyword::kGruppenkennfeld, &DCMConverter::InsertGruppenKennfeld,
+     &DCMConverter::WriteGruppenKennfeld},
+    {dcm::keyword::kTextstring, &DCMConverter::InsertTextstring, &DCMConverter::WriteTextstring},
+};
+
+namespace {
+
+constexpr std::wstring_view kCommentMark = L"* ";
+
+} // namespace
+
+DCMConverter::DCMConverter() : m_bBlockSeen(0)
+{}
+
+DCMConverter& DCMConverter::operator=(const DCMConverter& other)
+{
+    DCMConverter copy(other);
+    return *this = std::move(copy);
+}
+
+DCMConverter::~DCMConverter() = default;
+
+HRESULT DCMConverter::Import(const CString& strPath)
+{
+    try {
+        PravFile file(strPath, CFile::modeRead);
+        m_bBlockSeen = 0;
+        HRESULT result = S_OK;
+        CString block;
+        while (file.ReadBlock(block))
+            result = AnalyzeToken(block);
+        return result;
+    } catch (...) {
+        return E_UNEXPECTED;
+    }
+}
+
+/// Takes what is in front of the first blank, wherever that stands, as the keyword of the block.
+HRESULT DCMConverter::AnalyzeToken(const CString& strBlock)
+{
+    const std::wstring_view block = strBlock;
+    const std::size_t blank = block.find(L' ');
+    if (blank == block.npos)
+        return S_OK;
+    const std::wstring_view keyword = block.substr(0, blank);
+    const auto* const kind =
+        std::find_if(std::begin(kBlockKinds), std::end(kBlockKinds),
+                     [&](const BlockKind& k) { return dcm::EqualsNoCase(keyword, k.keyword); });
+    if (kind != std::end(kBlockKinds)) {
+        // A block that its parser rejects is dropped, but it ends the comment like any other.
+        (this->*kind->insert)(strBlock);
+        m_bBlockSeen = 1;
+    } else if (dcm::EqualsNoCase(keyword, dcm::keyword::kKonservierungFormat)) {
+        InsertKonservierungsFormat(strBlock);
+        m_bBlockSeen = 1;
+    } else if (keyword == dcm::keyword::kComment && m_bBlockSeen == 0) {
+        InsertKommentar(strBlock);
+    }
+    return S_OK;
+}
+
+/// Removes the marks in one pass, so that a mark which forms anew stays.
+HRESULT DCMConverter::InsertKommentar(const CString& strBlock)
+{
+    CString comment;
+    std::wstring_view rest = strBlock;
+    for (;;) {
+        const std::size_t mark = rest.find(kCommentMark);
+        comment += rest.substr(0, mark);
+        if (mark == rest.npos)
+            break;
+        rest.remove_prefix(mark + kCommentMark.size());
+    }
+    m_strComment = std::move(comment);
+    return S_OK;
+}
+
+/// The version that a file declares changes nothing in the document.
+HRESULT DCMConverter::InsertKonservierungsFormat(const CString&)
+{
+    return S_OK;
+}
+
+/// Parses a new block and stores it unless the parser rejects it.
+template <class Block>
+HRESULT DCMConverter::InsertBlock(std::list<Block>& blocks, const CString& strBlock)
+{
+    std::list<Block> fresh(1);
+    const HRESULT result = fresh.front().Init(strBlock);
+    if (SUCCEEDED(result))
+        blocks.splice(blocks.end(), fresh);
+    return result;
+}
+
+HRESULT DCMConverter::InsertFestwert(const CString& strBlock)
+{
+    return InsertBlock(m_listFestwerte, strBlock);
+}
+
+HRESULT DCMConverter::InsertFestwerteBlock(const CString& strBlock)
+{
+    return InsertBlock(m_listFestwerteblock, strBlock);
+}
+
+HRESULT DCMConverter::InsertStuetzstellenverteilung(const CString& strBlock)
+{
+    return InsertBlock(m_listStuetzstellenverteilung, strBlock);
+}
+
+HRESULT DCMConverter::InsertKennlinie(const CString& strBlock)
+{
+    return InsertBlock(m_listKennlinie, strBlock);
+}
+
+HRESULT DCMConverter::InsertFestKennlinie(const CString& strBlock)
+{
+    return InsertBlock(m_listFestkennlinie, strBlock);
+}
+
+HRESULT DCMConverter::InsertGruppenKennlinie(const CString& strBlock)
+{
+    return InsertBlock(m_listGruppenkennlinie, strBlock);
+}
+
+HRESULT DCMConverter::InsertKennfeld(const CString& strBlock)
+{
+    return InsertBlock(m_listKennfeld, strBlock);
+}
+
+HRESULT DCMConverter::InsertFestKennfeld(const CString& strBlock)
+{
+    return InsertBlock(m_listFestkennfeld, strBlock);
+}
+
+HRESULT DCMConverter::InsertGruppenKennfeld(const CString& strBlock)
+{
+    return InsertBlock(m_listGruppenkennfeld, strBlock);
+}
+
+HRESULT DCMConverter::InsertTextstring(const CString& strBlock)
+{
+    return InsertBlock(m_listTextstring, strBlock);
+}
+
+HRESULT DCMConverter::AddFestwert(const DCMFestwert& block)
+{
+    m_listFestwerte.push_back(block);
+    return S_OK;
+}
+
+HRESULT DCMConverter::AddFestwerteblock(const DCMFestwerteblock& block)
+{
+    m_listFestwerteblock.push_back(block);
+    return S_OK;
+}
+
+HRESULT DCMConverter::AddStuetzstellenverteilung(DCMStuetzstellenverteilung block)
+{
+    m_listStuetzstellenverteilung.push_back(std::move(block));
+    return S_OK;
+}
+
+HRESULT DCMConverter::AddKennlinie(const DCMKennlinie& block)
+{
+    m_listKennlinie.push_back(block);
+    return S_OK;
+}
+
+HRESULT DCMConverter::AddFestkennlinie(const DCMFestkennlinie& block)
+{
+    m_listFestkennlinie.push_back(block);
+    return S_OK;
+}
+
+HRESULT DCMConverter::AddGruppenkennlinie(const DCMGruppenkennlinie& block)
+{
+    m_listGruppenkennlinie.push_back(block);
+    return S_OK;
+}
+
+HRESULT DCMConverter::AddKennfeld(const DCMKennfeld& block)
+{
+    m_listKennfeld.push_back(block);
+    return S_OK;
+}
+
+HRESULT DCMConverter::AddFestkennfeld(const DCMFestkennfeld& block)
+{
+    m_listFestkennfeld.push_back(block);
+    return S_OK;
+}
+
+HRESULT DCMConverter::AddGruppenkennfeld(const DCMGruppenkennfeld& block)
+{
+    m_listGruppenkennfeld.push_back(block);
+    return S_OK;
+}
+
+HRESULT DCMConverter::AddTextstring(const DCMTextstring& block)
+{
+    m_listTextstring.push_back(block);
+    return S_OK;
+}
+
+HRESULT DCMConverter::Export(const CString& strPath) const
+{
+    try {
+        PravFile file(strPath, CFile::modeCreate | CFile::modeWrite);
+        HRESULT result = S_OK;
+        CFileStatus status;
+        if (file.GetStatus(status)) {
+            result = WriteHeader(file);
+            result = WriteFormat(file);
+            for (const BlockKind& kind : kBlockKinds)
+                result = (this->*kind.write)(file);
+        }
+        file.Close();
+        return result;
+    } catch (...) {
+        return E_UNEXPECTED;
+    }
+}
+
+HRESULT DCMConverter::WriteHeader(PravFile& file) const
+{
+    return m_header.Export(file);
+}
+
+HRESULT DCMConverter::WriteFormat(PravFile& file) const
+{
+    return m_format.Export(file);
+}
+
+/// Writes each block's text. The stored blocks stay as they are: what a block's own export changes
+/// in it, a unit of one blank, belongs to the caller who holds that block.
+template <class Block>
+HRESULT DCMConverter::WriteBlocks(const std::list<Block>& blocks, PravFile& file)
+{
+    for (const Block& block : blocks)
+        file.WriteText(block.BlockText());
+    return S_OK;
+}
+
+HRESULT DCMConverter::WriteFestwerte(PravFile& file) const
+{
+    return WriteBlocks(m_listFestwerte, file);
+}
+
+HRESULT DCMConverter::WriteFestwerteblock(PravFile& file) const
+{
+    return WriteBlocks(m_listFestwerteblock, file);
+}
+
+HRESULT DCMConverter::WriteStuetzstellenverteilung(PravFile& file) const
+{
+    return WriteBlocks(m_listStuetzstellenverteilung, file);
+}
+
+HRESULT DCMConverter::WriteKennlinie(PravFile& file) const
+{
+    return WriteBlocks(m_listKennlinie, file);
+}
+
+HRESULT DCMConverter::WriteFestKennlinie(PravFile& file) const
+{
+    return WriteBlocks(m_listFestkennlinie, file);
+}
+
+HRESULT DCMConverter::WriteGruppenKennlinie(PravFile& file) const
+{
+    return WriteBlocks(m_listGruppenkennlinie, file);
+}
+
+HRESULT DCMConverter::WriteKennfeld(PravFile& file) const
+{
+    return WriteBlocks(m_listKennfeld, file);
+}
+
+HRESULT DCMConverter::WriteFestKennfeld(PravFile& file) const
+{
+    return WriteBlocks(m_listFestkennfeld, file);
+}
+
+HRESULT DCMConverter::WriteGruppenKennfeld(PravFile& file) const
+{
+    return WriteBlocks(m_listGruppenkennfeld, file);
+}
+
+HRESULT DCMConverter::WriteTextstring(PravFile& file) const
+{
+    return WriteBlocks(m_listTextstring, file);
+}
