@@ -303,4 +303,11 @@ std::string ToUtf8(std::wstring_view text)
     return NarrowBuiltIn(text, Encoding::kUtf8);
 }
 
+CString FromUtf8(std::string_view text)
+{
+    CString wide;
+    AppendWide(wide, text, Encoding::kUtf8);
+    return wide;
+}
+
 } // namespace dcm

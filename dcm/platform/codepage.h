@@ -47,7 +47,8 @@ CString Widen(std::string_view bytes);
 /// `text` in the thread's code page; a character that the page lacks becomes `?`.
 std::string Narrow(std::wstring_view text);
 
-/// `text` in UTF-8; what is no character becomes U+FFFD.
-std::string ToUtf8(std::wstring_view text);
+/// `text` in UTF-8, and the wide form of a text in UTF-8; what is no character becomes U+FFFD.
+DCM_API std::string ToUtf8(std::wstring_view text);
+DCM_API CString FromUtf8(std::string_view text);
 
 } // namespace dcm
