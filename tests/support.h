@@ -1,0 +1,160 @@
+#pragma once
+
+#include "dcm/library/dcm.h"
+
+#include <charconv>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <ostream>
+#include <random>
+#include <string>
+#include <string_view>
+#include <system_error>
+#include <utility>
+#include <vector>
+
+/// How a failed comparison shows a text.
+inline void PrintTo(const CString& text, std::ostream* out)
+{
+    *out << '"' << dcm::ToUtf8(text) << '"';
+}
+
+namespace test {
+
+/// A folder that goes with the object and all that is in it.
+class Folder
+{
+public:
+    Folder()
+    {
+        std::random_device random;
+        do {
+            m_path = std::filesystem::temp_directory_path() / ("dcm" + std::to_string(random()));
+        } while (!std::filesystem::create_directory(m_path));
+    }
+    Folder(const Folder&) = delete;
+    Folder& operator=(const Folder&) = delete;
+    ~Folder()
+    {
+        std::error_code ignored;
+        std::filesystem::remove_all(m_path, ignored);
+    }
+
+    CString operator/(const wchar_t* name) const
+    {
+        return CString(m_path.wstring()) + L"/" + CString(name);
+    }
+
+private:
+    std::filesystem::path m_path;
+};
+
+inline std::filesystem::path PathOf(const CString& path)
+{
+    const std::string utf8 = dcm::ToUtf8(path);
+    return std::filesystem::path(std::u8string(utf8.begin(), utf8.end()));
+}
+
+inline std::string ReadBytes(const std::filesystem::path& path)
+{
+    std::ifstream file(path, std::ios::binary);
+    return std::string(std::istreambuf_iterator<char>(file), {});
+}
+
+inline std::string ReadBytes(const CString& path)
+{
+    return ReadBytes(PathOf(path));
+}
+
+inline void WriteBytes(const CString& path, std::string_view bytes)
+{
+    std::ofstream file(PathOf(path), std::ios::binary);
+    file.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
+}
+
+/// Every `from` in `text` as `to`.
+inline std::string Replaced(std::string text, std::string_view from, std::string_view to)
+{
+    for (std::size_t at = text.find(from); at != text.npos; at = text.find(from, at + to.size()))
+        text.replace(at, from.size(), to);
+    return text;
+}
+
+/// A new block that has read `text`.
+template <class Block>
+Block Parsed(std::string_view text)
+{
+    Block block;
+    block.Init(dcm::Widen(text));
+    return block;
+}
+
+/// What a block writes, with single line feeds. `block` is changed as its export changes it.
+template <class Block>
+std::string Written(Block&& block)
+{
+    const Folder folder;
+    PravFile file(folder / L"block", CFile::modeCreate | CFile::modeWrite);
+    if (block.Export(file) != S_OK)
+        return "failed";
+    file.Close();
+    return Replaced(ReadBytes(folder / L"block"), "\r\n", "\n");
+}
+
+/// Imports a file of these bytes.
+inline HRESULT ImportBytes(DCMConverter& document, std::string_view bytes)
+{
+    const Folder folder;
+    WriteBytes(folder / L"in.dcm", bytes);
+    return document.Import(folder / L"in.dcm");
+}
+
+/// The bytes of the document's file; "failed" when it could not be written.
+inline std::string ExportBytes(const DCMConverter& document)
+{
+    const Folder folder;
+    return document.Export(folder / L"out.dcm") == S_OK ? ReadBytes(folder / L"out.dcm") : "failed";
+}
+
+/// The shortest text of a number, whatever the locale.
+inline std::string Show(double value)
+{
+    char text[32];
+    return {text, std::to_chars(text, text + sizeof text, value).ptr};
+}
+
+/// A number as it is, a text in single quotes ('-' for an absent one), else the tag in brackets.
+inline std::string Show(const VARIANT& value)
+{
+    if (value.vt == VT_R8)
+        return Show(value.dblVal);
+    if (value.vt == VT_BSTR)
+        return value.bstrVal == nullptr ? "-" : "'" + dcm::ToUtf8(CComVariant::TextOf(value)) + "'";
+    return "[" + std::to_string(value.vt) + "]";
+}
+
+inline std::string Show(const CString& text)
+{
+    return "'" + dcm::ToUtf8(text) + "'";
+}
+
+/// The items of a list, one blank between two.
+template <class List>
+std::string ShowAll(const List& items)
+{
+    std::string all;
+    for (const auto& item : items)
+        all += (all.empty() ? "" : " ") + Show(item);
+    return all;
+}
+
+/// The items that a getter fills an array with, which had other content before.
+template <class Block>
+std::string Points(const Block& block, HRESULT (Block::*getter)(std::vector<CComVariant>&) const)
+{
+    std::vector<CComVariant> points{L"before", 1.0};
+    return (block.*getter)(points) == S_OK ? ShowAll(points) : "failed";
+}
+
+} // namespace test
