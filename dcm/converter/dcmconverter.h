@@ -26,9 +26,10 @@ class DCM_API DCMConverter
 public:
     /// No blocks, empty header and comment.
     DCMConverter();
+    /// All of the other document; one that was moved from has no defined content.
     DCMConverter(const DCMConverter&) = default;
     DCMConverter(DCMConverter&&) noexcept = default;
-    /// The document is as it was when memory runs out.
+    /// As construction does. The document is as it was when memory runs out.
     DCMConverter& operator=(const DCMConverter& other);
     DCMConverter& operator=(DCMConverter&&) noexcept = default;
     virtual ~DCMConverter();

@@ -12,6 +12,7 @@ class DCM_API DCMHeader
 public:
     /// An empty text.
     DCMHeader();
+    /// The text of the other header.
     DCMHeader(const DCMHeader&) = default;
     DCMHeader(DCMHeader&&) noexcept = default;
     DCMHeader& operator=(const DCMHeader&) = default;

@@ -14,6 +14,7 @@ class DCM_API DCMBaseType
 public:
     /// Four empty texts.
     DCMBaseType();
+    /// The four texts of the other block; one that was moved from has no defined content.
     DCMBaseType(const DCMBaseType&) = default;
     DCMBaseType(DCMBaseType&&) noexcept = default;
     DCMBaseType& operator=(const DCMBaseType&) = default;
@@ -34,6 +35,7 @@ public:
     CString& GetFunction() { return m_strFunction; }
     const CString& GetFunction() const { return m_strFunction; }
 
+    /// Stores a copy of the text, unchecked.
     void SetName(const CString& strName) { m_strName = strName; }
     void SetLangname(const CString& strLangname) { m_strLangname = strLangname; }
     void SetDisplayname(const CString& strDisplayname) { m_strDisplayname = strDisplayname; }

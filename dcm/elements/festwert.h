@@ -12,11 +12,12 @@ class DCM_API DCMFestwert : public DCMBaseType
 public:
     /// Empty texts and no value.
     DCMFestwert();
-    /// Copies take the keyword along: a copy of a TEXTSTRING writes a TEXTSTRING.
+    /// Copies take the keyword along: a copy of a TEXTSTRING writes a TEXTSTRING. A block that was
+    /// moved from has no defined content. Raises when the text of the value cannot be copied.
     DCMFestwert(const DCMFestwert&) = default;
     DCMFestwert(DCMFestwert&&) noexcept = default;
-    /// When the text of the value cannot be copied, the value becomes `VT_ERROR` with the failure
-    /// code, and the failure is raised.
+    /// As construction does. When the text of the value cannot be copied, the value becomes
+    /// `VT_ERROR` with the failure code, and the failure is raised.
     DCMFestwert& operator=(const DCMFestwert&) = default;
     DCMFestwert& operator=(DCMFestwert&&) noexcept = default;
     ~DCMFestwert() override;
@@ -47,6 +48,7 @@ public:
     /// stays valid as long as the block and may be written through.
     CString& GetUnit() { return m_strUnit; }
     const CString& GetUnit() const { return m_strUnit; }
+    /// Stores a copy of the unit, unchecked; empty for none.
     void SetUnit(const CString& strUnit) { m_strUnit = strUnit; }
 
 protected:
@@ -65,7 +67,9 @@ private:
 class DCM_API DCMTextstring : public DCMFestwert
 {
 public:
+    /// Empty texts and no value.
     DCMTextstring();
+    /// As for `DCMFestwert`.
     DCMTextstring(const DCMTextstring&) = default;
     DCMTextstring(DCMTextstring&&) noexcept = default;
     DCMTextstring& operator=(const DCMTextstring&) = default;

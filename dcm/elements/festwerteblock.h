@@ -16,9 +16,10 @@ class DCM_API DCMFestwerteblock : public DCMBaseType
 public:
     /// Empty texts, no values, both counts 0.
     DCMFestwerteblock();
+    /// All of the other block; one that was moved from has no defined content.
     DCMFestwerteblock(const DCMFestwerteblock&) = default;
     DCMFestwerteblock(DCMFestwerteblock&&) noexcept = default;
-    /// The block is as it was when memory runs out.
+    /// As construction does. The block is as it was when memory runs out.
     DCMFestwerteblock& operator=(const DCMFestwerteblock& other);
     DCMFestwerteblock& operator=(DCMFestwerteblock&&) noexcept = default;
     ~DCMFestwerteblock() override;
@@ -42,18 +43,20 @@ public:
     /// Values row after row: GetYValueCount() rows of GetXValueCount() values; one list when
     /// either count is 0. A copy; changing it leaves the block as is.
     std::list<double> GetDoubleValues() const { return m_listDoubleValues; }
-    /// The same for the texts.
+    /// The same for the texts: what TEXT lines hold, in order.
     std::list<CString> GetStringValues() const { return m_listStringValues; }
 
     /// Text of EINHEIT_W as it stands in the file, not interpreted; may be empty. The reference
     /// stays valid as long as the block and may be written through.
     CString& GetUnit() { return m_strUnit; }
     const CString& GetUnit() const { return m_strUnit; }
+    /// Stores a copy of the unit, unchecked; empty for none.
     void SetUnit(const CString& strUnit) { m_strUnit = strUnit; }
 
     /// Values in a row and number of rows; 0 for a one-dimensional block.
     std::int32_t GetXValueCount() const { return m_nXValueCount; }
     std::int32_t GetYValueCount() const { return m_nYValueCount; }
+    /// Any number is stored; one of 0 or less makes the block one-dimensional.
     void SetXValueCount(std::int32_t nCount) { m_nXValueCount = nCount; }
     void SetYValueCount(std::int32_t nCount) { m_nYValueCount = nCount; }
 

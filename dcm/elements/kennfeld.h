@@ -24,10 +24,11 @@ class DCM_API DCMKennfeld : public DCMBaseType
 public:
     /// Empty texts, no points, axis lengths 0.
     DCMKennfeld();
-    /// Copies take the keyword along and have texts of their own.
+    /// Copies take the keyword along and have texts of their own. A map that was moved from has no
+    /// defined content.
     DCMKennfeld(const DCMKennfeld&) = default;
     DCMKennfeld(DCMKennfeld&&) noexcept = default;
-    /// The map is as it was when memory runs out.
+    /// As construction does. The map is as it was when memory runs out.
     DCMKennfeld& operator=(const DCMKennfeld& other);
     DCMKennfeld& operator=(DCMKennfeld&&) noexcept = default;
     ~DCMKennfeld() override;
@@ -65,6 +66,7 @@ public:
     /// The counts on the first line. They are not compared with the points.
     std::int32_t GetAxisLenghtX() const { return m_nAxisLengthX; }
     std::int32_t GetAxisLenghtY() const { return m_nAxisLengthY; }
+    /// Any number is stored; one of 0 or less leaves the count to the points of the axis.
     void SetAxisLenghtX(std::int32_t nLength) { m_nAxisLengthX = nLength; }
     void SetAxisLenghtY(std::int32_t nLength) { m_nAxisLengthY = nLength; }
 
@@ -76,6 +78,7 @@ public:
     const CString& GetUnit_Y() const { return m_strUnitY; }
     CString& GetUnit_W() { return m_strUnitW; }
     const CString& GetUnit_W() const { return m_strUnitW; }
+    /// Stores a copy of the unit, unchecked; empty for none.
     void SetUnit_X(const CString& strUnit) { m_strUnitX = strUnit; }
     void SetUnit_Y(const CString& strUnit) { m_strUnitY = strUnit; }
     void SetUnit_W(const CString& strUnit) { m_strUnitW = strUnit; }
@@ -131,7 +134,9 @@ private:
 class DCM_API DCMFestkennfeld : public DCMKennfeld
 {
 public:
+    /// Empty texts, no points.
     DCMFestkennfeld();
+    /// As for `DCMKennfeld`.
     DCMFestkennfeld(const DCMFestkennfeld&) = default;
     DCMFestkennfeld(DCMFestkennfeld&&) noexcept = default;
     DCMFestkennfeld& operator=(const DCMFestkennfeld&) = default;
@@ -143,7 +148,9 @@ public:
 class DCM_API DCMGruppenkennfeld : public DCMKennfeld
 {
 public:
+    /// Empty texts, no points.
     DCMGruppenkennfeld();
+    /// As for `DCMKennfeld`.
     DCMGruppenkennfeld(const DCMGruppenkennfeld&) = default;
     DCMGruppenkennfeld(DCMGruppenkennfeld&&) noexcept = default;
     DCMGruppenkennfeld& operator=(const DCMGruppenkennfeld&) = default;

@@ -24,10 +24,11 @@ class DCM_API DCMKennlinie : public DCMBaseType
 public:
     /// Empty texts, no points, axis length 0.
     DCMKennlinie();
-    /// Copies take the keyword along and have texts of their own.
+    /// Copies take the keyword along and have texts of their own. A curve that was moved from has
+    /// no defined content.
     DCMKennlinie(const DCMKennlinie&) = default;
     DCMKennlinie(DCMKennlinie&&) noexcept = default;
-    /// The curve is as it was when memory runs out.
+    /// As construction does. The curve is as it was when memory runs out.
     DCMKennlinie& operator=(const DCMKennlinie& other);
     DCMKennlinie& operator=(DCMKennlinie&&) noexcept = default;
     ~DCMKennlinie() override;
@@ -66,6 +67,7 @@ public:
 
     /// The count on the first line. It is not compared with the points.
     std::int32_t GetAxisLenghtX() const { return m_nAxisLengthX; }
+    /// Any number is stored; one of 0 or less leaves the count to the values.
     void SetAxisLenghtX(std::int32_t nLength) { m_nAxisLengthX = nLength; }
 
     /// Texts of EINHEIT_X and EINHEIT_W as they stand in the file, not interpreted; may be empty.
@@ -74,6 +76,7 @@ public:
     const CString& GetUnit_X() const { return m_strUnitX; }
     CString& GetUnit_W() { return m_strUnitW; }
     const CString& GetUnit_W() const { return m_strUnitW; }
+    /// Stores a copy of the unit, unchecked; empty for none.
     void SetUnit_X(const CString& strUnit) { m_strUnitX = strUnit; }
     void SetUnit_W(const CString& strUnit) { m_strUnitW = strUnit; }
 
@@ -113,7 +116,9 @@ private:
 class DCM_API DCMFestkennlinie : public DCMKennlinie
 {
 public:
+    /// Empty texts, no points.
     DCMFestkennlinie();
+    /// As for `DCMKennlinie`.
     DCMFestkennlinie(const DCMFestkennlinie&) = default;
     DCMFestkennlinie(DCMFestkennlinie&&) noexcept = default;
     DCMFestkennlinie& operator=(const DCMFestkennlinie&) = default;
@@ -125,7 +130,9 @@ public:
 class DCM_API DCMGruppenkennlinie : public DCMKennlinie
 {
 public:
+    /// Empty texts, no points.
     DCMGruppenkennlinie();
+    /// As for `DCMKennlinie`.
     DCMGruppenkennlinie(const DCMGruppenkennlinie&) = default;
     DCMGruppenkennlinie(DCMGruppenkennlinie&&) noexcept = default;
     DCMGruppenkennlinie& operator=(const DCMGruppenkennlinie&) = default;

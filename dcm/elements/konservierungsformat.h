@@ -12,6 +12,7 @@ class DCM_API DCMKonservierungsFormat
 public:
     /// Version 0.0.
     DCMKonservierungsFormat();
+    /// The version of the other object.
     DCMKonservierungsFormat(const DCMKonservierungsFormat&) = default;
     DCMKonservierungsFormat& operator=(const DCMKonservierungsFormat&) = default;
     virtual ~DCMKonservierungsFormat();
@@ -20,6 +21,7 @@ public:
     /// number gives 0.0, any other text changes nothing. Returns 0.
     HRESULT Init(const CString& strBlock);
 
+    /// The version in memory; any number may be stored.
     void SetValue(double dValue) { m_dValue = dValue; }
     double GetValue() const { return m_dValue; }
 

@@ -20,10 +20,10 @@ class DCM_API DCMStuetzstellenverteilung : public DCMBaseType
 public:
     /// Empty texts, no points.
     DCMStuetzstellenverteilung();
-    /// Each copy has texts of its own.
+    /// Each copy has texts of its own. A distribution that was moved from has no defined content.
     DCMStuetzstellenverteilung(const DCMStuetzstellenverteilung&) = default;
     DCMStuetzstellenverteilung(DCMStuetzstellenverteilung&&) noexcept = default;
-    /// The distribution is as it was when memory runs out.
+    /// As construction does. The distribution is as it was when memory runs out.
     DCMStuetzstellenverteilung& operator=(const DCMStuetzstellenverteilung& other);
     DCMStuetzstellenverteilung& operator=(DCMStuetzstellenverteilung&&) noexcept = default;
     ~DCMStuetzstellenverteilung() override;
@@ -52,6 +52,7 @@ public:
     /// stays valid as long as the block and may be written through.
     CString& GetUnit() { return m_strUnit; }
     const CString& GetUnit() const { return m_strUnit; }
+    /// Stores a copy of the unit, unchecked; empty for none.
     void SetUnit(const CString& strUnit) { m_strUnit = strUnit; }
 
 private:

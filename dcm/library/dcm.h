@@ -1,5 +1,6 @@
 #pragma once
 
+/// @file
 /// The interface of the library: the document, the block classes, the text file and what a host
 /// needs in order to call them.
 #include "dcm/converter/dcmconverter.h"

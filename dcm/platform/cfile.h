@@ -11,6 +11,7 @@
 class DCM_API CFileException : public std::runtime_error
 {
 public:
+    /// What kind of failure it was.
     enum Cause
     {
         none,
@@ -28,11 +29,14 @@ public:
 
     /// An empty error record, to be filled by `CFile::Open`.
     CFileException();
+    /// One failure; the fields below are what they are given here.
     CFileException(Cause cause, long osError, const CString& fileName);
+    /// The same failure.
     CFileException(const CFileException&) = default;
     CFileException& operator=(const CFileException&) = default;
     ~CFileException() override;
 
+    /// `none` in an empty record.
     Cause m_cause;
     /// The system's own number of the error, 0 when the system had no part in it.
     long m_lOsError;
@@ -52,6 +56,7 @@ struct CFileStatus
 class DCM_API CFile
 {
 public:
+    /// How a file is opened; one of the modes, with or without `modeCreate`.
     enum OpenFlags : UINT
     {
         modeRead = 0,
@@ -65,6 +70,7 @@ public:
     CFile() noexcept;
     /// Opens the file; a failure is thrown as `CFileException`.
     CFile(const CString& path, UINT flags);
+    /// A file has one owner.
     CFile(const CFile&) = delete;
     CFile& operator=(const CFile&) = delete;
     /// Closes the file if it is open and keeps quiet about a failure: call `Close` to hear of it.

@@ -8,6 +8,9 @@
 #include <string>
 #include <string_view>
 
+/// @file
+/// Characters of files: the thread's code page and conversion from and to it.
+
 namespace dcm {
 
 /// Chooses the ANSI code page of the calling thread by its Windows identifier: 1252 (where a
@@ -27,10 +30,12 @@ enum class Encoding : unsigned char
 /// The bytes of a text file in an encoding that can be cut.
 struct FileText
 {
+    /// `size` bytes in `encoding`, owned.
     std::unique_ptr<char[]> bytes;
     std::size_t size = 0;
     Encoding encoding = Encoding::kWindows1252;
 
+    /// The bytes, valid as long as they are owned here.
     std::string_view View() const { return {bytes.get(), size}; }
 };
 

@@ -20,6 +20,7 @@ struct CStringData
     std::int32_t length;
     std::int32_t capacity;
 
+    /// The characters; their owner sees to the terminating zero.
     wchar_t* Text() { return reinterpret_cast<wchar_t*>(this + 1); }
 };
 
@@ -29,12 +30,14 @@ template <std::size_t N>
 class TextConstant
 {
 public:
+    /// Copies a literal, at compile time.
     constexpr TextConstant(const wchar_t (&text)[N]) : m_data{-1, N - 1, 0}, m_text{}
     {
         for (std::size_t i = 0; i < N; ++i)
             m_text[i] = text[i];
     }
 
+    /// The text without its terminating zero.
     constexpr operator std::wstring_view() const { return {m_text, N - 1}; }
 
 private:
@@ -57,12 +60,15 @@ public:
     CString(const wchar_t* text);
     /// The wide form of a zero-terminated text in the thread's code page; null gives an empty text.
     CString(const char* text);
+    /// A copy of a text, zeros in it included.
     CString(std::wstring_view text);
+    /// The constant itself; it must outlive the string and all its copies.
     template <std::size_t N>
     explicit CString(dcm::TextConstant<N>& text) noexcept : m_data(&text.m_data)
     {
         static_assert(offsetof(dcm::TextConstant<N>, m_text) == sizeof(dcm::CStringData));
     }
+    /// Shares the text of the other; one that was moved from may hold any text.
     CString(const CString& other) noexcept;
     CString(CString&& other) noexcept;
     CString& operator=(const CString& other) noexcept;
@@ -71,6 +77,7 @@ public:
 
     /// The number of characters.
     int GetLength() const noexcept { return m_data->length; }
+    /// Whether there is none.
     bool IsEmpty() const noexcept { return m_data->length == 0; }
     /// The character at `index`; an index outside the text raises `E_INVALIDARG`.
     wchar_t GetAt(int index) const;
@@ -90,6 +97,8 @@ public:
 
     /// Makes the text empty and keeps its memory for what is appended next.
     void Empty() noexcept;
+    /// Adds a text at the end, which may be part of this one. Raises `std::bad_alloc`, with the
+    /// text as it was, when memory runs out.
     CString& Append(std::wstring_view text);
     CString& operator+=(std::wstring_view text) { return Append(text); }
 
@@ -98,6 +107,7 @@ public:
     wchar_t* Extend(std::size_t room);
     void EndExtend(const wchar_t* end) noexcept;
 
+    /// One text behind the other; null counts as empty.
     friend CString operator+(const CString& a, const CString& b)
     {
         CString sum(a);
@@ -107,6 +117,7 @@ public:
     friend CString operator+(const CString& a, const wchar_t* b) { return a + CString(b); }
     friend CString operator+(const wchar_t* a, const CString& b) { return CString(a) + b; }
 
+    /// By the numbers of the characters, as `Compare`; null counts as empty.
     friend bool operator==(const CString& a, const CString& b) noexcept
     {
         return a.View() == b.View();

@@ -5,13 +5,18 @@
 
 #include <exception>
 
+/// @file
+/// Failures that are raised.
+
 namespace dcm {
 
 /// A failure that a result code names, raised where a call cannot return it.
 class DCM_API ResultError : public std::exception
 {
 public:
+    /// For `code`, which must be negative.
     explicit ResultError(HRESULT code) noexcept : m_code(code) {}
+    /// The same failure.
     ResultError(const ResultError&) noexcept = default;
     ResultError& operator=(const ResultError&) noexcept = default;
     ~ResultError() override;

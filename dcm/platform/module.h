@@ -3,11 +3,15 @@
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
 
+/// @file
+/// Registration of libraries that are loaded into the process.
+
 class CDynLinkLibrary;
 
 /// The state of one extension module, a library that registers itself while it is loaded.
 struct AFX_EXTENSION_MODULE
 {
+    /// TRUE while the module is loaded.
     BOOL bInitialized = FALSE;
     /// The system's handle of the library; may be null.
     void* hModule = nullptr;
@@ -27,11 +31,14 @@ DCM_API void AfxTermExtensionModule(AFX_EXTENSION_MODULE& state) noexcept;
 class DCM_API CDynLinkLibrary
 {
 public:
+    /// Enters the module, whose state must outlive this object.
     explicit CDynLinkLibrary(AFX_EXTENSION_MODULE& state) noexcept;
+    /// A registration is not copied.
     CDynLinkLibrary(const CDynLinkLibrary&) = delete;
     CDynLinkLibrary& operator=(const CDynLinkLibrary&) = delete;
     ~CDynLinkLibrary();
 
+    /// The state of the registered module.
     const AFX_EXTENSION_MODULE& Module() const noexcept { return m_state; }
     /// The last registered module, and the one registered before this; null at the end.
     static CDynLinkLibrary* Last() noexcept;

@@ -14,11 +14,13 @@ class DCM_API CComVariant : public VARIANT
 public:
     /// No value, `VT_EMPTY`.
     CComVariant() noexcept : VARIANT{} {}
+    /// A number, `VT_R8`.
     CComVariant(double value) noexcept : VARIANT{}
     {
         vt = VT_R8;
         dblVal = value;
     }
+    /// A number of single precision, `VT_R4`.
     CComVariant(float value) noexcept : VARIANT{}
     {
         vt = VT_R4;
@@ -49,15 +51,17 @@ public:
     }
     /// A text, `VT_BSTR`, copied from a zero-terminated one; null gives an absent text.
     CComVariant(const wchar_t* text);
+    /// A text, `VT_BSTR`; an empty one is present and empty.
     CComVariant(const CString& text) : CComVariant(text.View()) {}
     CComVariant(std::wstring_view text) : VARIANT{} { SetText(text); }
-    /// A copy of any variant.
+    /// A copy of any variant, which owns its content. A failure to copy is raised.
     CComVariant(const VARIANT& other) : VARIANT(other)
     {
         if (!IsPlain(other.vt))
             OwnCopy();
     }
     CComVariant(const CComVariant& other) : CComVariant(static_cast<const VARIANT&>(other)) {}
+    /// Takes the content over and leaves no value behind.
     CComVariant(CComVariant&& other) noexcept : VARIANT(other) { other.vt = VT_EMPTY; }
 
     /// Releases the content, then copies. When the copy fails the variant is left with the tag

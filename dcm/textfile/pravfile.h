@@ -41,6 +41,8 @@ public:
     int WriteText(const CString& text);
 
 protected:
+    /// Loads the text of the open file, or none when `flags` has the write flag or no file is open.
+    /// Throws `CFileException` when reading fails.
     void LoadContent(UINT flags);
 
 private:

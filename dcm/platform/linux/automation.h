@@ -4,6 +4,10 @@
 
 #include <cstdint>
 
+/// @file
+/// Result codes, variants and their texts, named as on Windows and with the same meaning.
+
+/// The numbers that the calls below take and give.
 using BOOL = int;
 using UINT = unsigned int;
 using LONG = std::int32_t;
@@ -11,22 +15,32 @@ using ULONGLONG = unsigned long long;
 using VARTYPE = unsigned short;
 using VARIANT_BOOL = short;
 
+/// The values of `BOOL`; any other than 0 counts as `TRUE`.
 inline constexpr BOOL FALSE = 0;
 inline constexpr BOOL TRUE = 1;
+/// The values of `VARIANT_BOOL`.
 inline constexpr VARIANT_BOOL VARIANT_FALSE = 0;
 inline constexpr VARIANT_BOOL VARIANT_TRUE = -1;
 
 /// The outcome of a call: negative for a failure, 0 (`S_OK`) for success.
 using HRESULT = std::int32_t;
 
+/// The call did what it promises.
 inline constexpr HRESULT S_OK = 0;
+/// An import or export that ended early.
 inline constexpr HRESULT E_UNEXPECTED = static_cast<HRESULT>(0x8000FFFFU);
+/// A null pointer was given.
 inline constexpr HRESULT E_POINTER = static_cast<HRESULT>(0x80004003U);
+/// A block that its kind does not allow.
 inline constexpr HRESULT E_FAIL = static_cast<HRESULT>(0x80004005U);
+/// Memory ran out.
 inline constexpr HRESULT E_OUTOFMEMORY = static_cast<HRESULT>(0x8007000EU);
+/// A position outside a text.
 inline constexpr HRESULT E_INVALIDARG = static_cast<HRESULT>(0x80070057U);
+/// A tag that no variant may have.
 inline constexpr HRESULT DISP_E_BADVARTYPE = static_cast<HRESULT>(0x80020008U);
 
+/// Whether a result code tells of success, or of a failure.
 constexpr bool SUCCEEDED(HRESULT result)
 {
     return result >= 0;
@@ -69,10 +83,13 @@ enum VARENUM : VARTYPE
 /// A value with its type tag. A plain structure: it releases nothing by itself.
 struct VARIANT
 {
+    /// One of `VARENUM`; it tells which member of the union holds the value.
     VARTYPE vt;
+    /// Nothing; room as elsewhere.
     std::uint16_t wReserved1;
     std::uint16_t wReserved2;
     std::uint16_t wReserved3;
+    /// The value; its members go with the tags.
     union
     {
         double dblVal;
