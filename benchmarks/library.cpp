@@ -1,0 +1,79 @@
+#include "benchmarks/contestant.h"
+
+#include "dcm/library/dcm.h"
+
+#include <stdexcept>
+
+namespace dcm::bench {
+namespace {
+
+void AddPoints(Checksum& checksum, const std::vector<CComVariant>& points)
+{
+    for (const CComVariant& point : points)
+        checksum.Add(point.dblVal);
+}
+
+std::uint64_t ChecksumOf(const DCMConverter& document)
+{
+    Checksum checksum;
+    std::vector<CComVariant> points;
+    CComVariant value;
+    for (const DCMFestwert& block : document.GetFestwerte()) {
+        block.GetValue(&value);
+        checksum.Add(value.dblVal);
+    }
+    for (const DCMFestwerteblock& block : document.GetFestwerteblock()) {
+        for (const double number : block.GetDoubleValues())
+            checksum.Add(number);
+    }
+    for (const DCMStuetzstellenverteilung& block : document.GetStuetzstellenverteilung()) {
+        block.GetValues(points);
+        AddPoints(checksum, points);
+    }
+    const auto addCurves = [&](const auto& curves) {
+        for (const DCMKennlinie& block : curves) {
+            block.GetAxis(points);
+            AddPoints(checksum, points);
+            block.GetValues(points);
+            AddPoints(checksum, points);
+        }
+    };
+    addCurves(document.GetKennlinie());
+    addCurves(document.GetFestkennlinie());
+    addCurves(document.GetGruppenkennlinie());
+    const auto addMaps = [&](const auto& maps) {
+        for (const DCMKennfeld& block : maps) {
+            block.GetAxis_X(points);
+            AddPoints(checksum, points);
+            block.GetAxis_Y(points);
+            AddPoints(checksum, points);
+            block.GetValues(points);
+            AddPoints(checksum, points);
+        }
+    };
+    addMaps(document.GetKennfeld());
+    addMaps(document.GetFestkennfeld());
+    addMaps(document.GetGruppenkennfeld());
+    return checksum.Value();
+}
+
+const TakesPart kImport("import/dcm", [](const Stage& stage) {
+    Outcome outcome;
+    DCMConverter document;
+    const CString path(stage.dcmFile.c_str());
+    if (Timed(outcome.seconds, [&] { return document.Import(path); }) != S_OK)
+        throw std::runtime_error("import failed");
+    outcome.checksum = ChecksumOf(document);
+    return outcome;
+});
+
+const TakesPart kExport("export/dcm", [](const Stage& stage) {
+    Outcome outcome;
+    const CString path(stage.outputFile.c_str());
+    if (Timed(outcome.seconds, [&] { return stage.document.Export(path); }) != S_OK)
+        throw std::runtime_error("export failed");
+    return outcome;
+});
+
+} // namespace
+} // namespace dcm::bench

@@ -1,0 +1,27 @@
+#pragma once
+
+#include "benchmarks/contestant.h"
+
+#include <cstddef>
+#include <filesystem>
+#include <memory>
+#include <string_view>
+
+/// Reading and writing with nothing but the standard library: what the work costs at least, and
+/// what it costs a host that does it by hand.
+namespace dcm::bench {
+
+/// The bytes of a whole file.
+struct FileBytes
+{
+    std::unique_ptr<char[]> bytes;
+    std::size_t size = 0;
+
+    std::string_view View() const { return {bytes.get(), size}; }
+};
+FileBytes ReadFile(const std::filesystem::path& path);
+
+/// The floor for reading: one pass over the bytes, the numbers of each block and nothing else.
+BlockNumbers ReadFloor(const std::filesystem::path& path);
+
+} // namespace dcm::bench
