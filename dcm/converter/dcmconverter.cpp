@@ -269,8 +269,12 @@ HRESULT DCMConverter::WriteFormat(PravFile& file) const
 template <class Block>
 HRESULT DCMConverter::WriteBlocks(const std::list<Block>& blocks, PravFile& file)
 {
-    for (const Block& block : blocks)
-        file.WriteText(block.BlockText());
+    CString text;
+    for (const Block& block : blocks) {
+        text.Empty();
+        block.ComposeBlock(text);
+        file.WriteText(text);
+    }
     return S_OK;
 }
 

@@ -1,5 +1,7 @@
 #include "dcm/elements/block_lines.h"
 
+#include <algorithm>
+
 namespace dcm {
 
 BlockLines::BlockLines(std::wstring_view block)
@@ -12,11 +14,13 @@ bool BlockLines::Next(BlockLine& line)
         const std::size_t end = m_left.find(L'\n');
         if (end == m_left.npos)
             return false;
-        const std::wstring_view text = TrimLeftWhite(m_left.substr(0, end));
+        const std::wstring_view text = TrimLeft({m_left.data(), end}, IsWhite);
         m_left.remove_prefix(end + 1);
-        const std::size_t blank = text.find(L' ');
-        if (blank != text.npos) {
-            line = {text.substr(0, blank), text.substr(blank + 1)};
+        const wchar_t* const last = text.data() + text.size();
+        // Keywords are short: the blank behind one is near.
+        const wchar_t* const blank = std::find(text.data(), last, L' ');
+        if (blank != last) {
+            line = {{text.data(), blank}, {blank + 1, last}};
             return true;
         }
     }
@@ -31,12 +35,7 @@ std::wstring_view TakeName(std::wstring_view& rest)
         return {};
     }
     rest = TrimWhite(text.substr(blank));
-    return TrimRightWhite(text.substr(0, blank));
-}
-
-std::wstring_view Unquoted(std::wstring_view rest)
-{
-    return Trim(rest, L" \"");
+    return TrimRight(text.substr(0, blank), IsWhite);
 }
 
 } // namespace dcm

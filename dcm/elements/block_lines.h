@@ -36,7 +36,4 @@ private:
 /// space in front is the caller's matter.
 std::wstring_view TakeName(std::wstring_view& rest);
 
-/// `rest` without the blanks and double quotes at both ends, in any mix.
-std::wstring_view Unquoted(std::wstring_view rest);
-
 } // namespace dcm

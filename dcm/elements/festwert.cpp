@@ -73,8 +73,8 @@ HRESULT DCMFestwert::Init(const CString& strBlock)
     dcm::BlockLines lines(strBlock);
     dcm::BlockLine line;
     while (lines.Next(line)) {
-        const std::wstring_view text = dcm::Trim(dcm::TrimWhite(line.rest), L"\"");
-        const std::wstring_view rest = dcm::Trim(text, L" ");
+        const std::wstring_view text = dcm::TrimQuotes(dcm::TrimWhite(line.rest));
+        const std::wstring_view rest = dcm::TrimBlanks(text);
         if (line.Is(m_strKeyword))
             SetName(rest);
         else if (ReadAttribute(line.keyword, rest, rest))
@@ -90,28 +90,27 @@ HRESULT DCMFestwert::Init(const CString& strBlock)
         else if (text == L"false")
             m_value = 0.0;
         else
-            m_value.SetText(dcm::Trim(dcm::TrimWhite(text), L"\""));
+            m_value.SetText(dcm::TrimQuotes(dcm::TrimWhite(text)));
     }
     return S_OK;
 }
 
 HRESULT DCMFestwert::Export(PravFile& file)
 {
-    const CString block = BlockText();
+    CString block;
+    ComposeBlock(block);
     dcm::DropBlankUnit(m_strUnit);
     file.WriteText(block);
     return S_OK;
 }
 
-CString DCMFestwert::BlockText() const
+void DCMFestwert::ComposeBlock(CString& block) const
 {
-    CString block = m_strKeyword;
-    block.Append(L" ").Append(GetName()).Append(L"\n");
+    block.Append(m_strKeyword).Append(L" ").Append(GetName()).Append(L"\n");
     AppendAttributes(block);
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnit);
     AppendValueLine(block, m_value);
     dcm::AppendEnd(block);
-    return block;
 }
 
 HRESULT DCMFestwert::GetValue(VARIANT* pValue) const

@@ -57,7 +57,8 @@ protected:
 
 private:
     friend class DCMConverter;
-    CString BlockText() const;
+    /// Composes the block in `block`, which is empty before.
+    void ComposeBlock(CString& block) const;
 
     CString m_strUnit;
     CComVariant m_value;

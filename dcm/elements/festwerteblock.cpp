@@ -57,7 +57,7 @@ HRESULT DCMFestwerteblock::Init(const CString& strBlock)
     dcm::BlockLine line;
     while (lines.Next(line)) {
         // White space first, then blanks and quotes, for every line of the block.
-        const std::wstring_view rest = dcm::Unquoted(dcm::TrimWhite(line.rest));
+        const std::wstring_view rest = dcm::TrimBlanksAndQuotes(dcm::TrimWhite(line.rest));
         if (line.Is(dcm::keyword::kFestwerteblock))
             ReadFirstLine(rest);
         else if (ReadAttribute(line.keyword, rest, rest))
@@ -94,7 +94,7 @@ HRESULT DCMFestwerteblock::AddValues(std::wstring_view rest)
     while (more) {
         double number = 0;
         more = dcm::TakeNumber(rest, number);
-        m_listDoubleValues.push_back(number);
+        m_vecDoubleValues.push_back(number);
     }
     return S_OK;
 }
@@ -137,19 +137,19 @@ HRESULT DCMFestwerteblock::AddStringValues(std::wstring_view rest)
 
 HRESULT DCMFestwerteblock::Export(PravFile& file)
 {
-    const CString block = BlockText();
+    CString block;
+    ComposeBlock(block);
     dcm::DropBlankUnit(m_strUnit);
     file.WriteText(block);
     return S_OK;
 }
 
-CString DCMFestwerteblock::BlockText() const
+void DCMFestwerteblock::ComposeBlock(CString& block) const
 {
-    CString block(dcm::keyword::kFestwerteblock);
-    block.Append(L" ").Append(GetName());
+    block.Append(dcm::keyword::kFestwerteblock).Append(L" ").Append(GetName());
     if (m_nYValueCount == 0) {
-        const bool numbers = !m_listDoubleValues.empty();
-        dcm::AppendCount(block, numbers ? m_listDoubleValues.size() : m_listStringValues.size());
+        const bool numbers = !m_vecDoubleValues.empty();
+        dcm::AppendCount(block, numbers ? m_vecDoubleValues.size() : m_listStringValues.size());
     } else {
         dcm::AppendCount(block, m_nXValueCount);
         block.Append(L" @");
@@ -160,7 +160,6 @@ CString DCMFestwerteblock::BlockText() const
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnit);
     ExportValues(block);
     dcm::AppendEnd(block);
-    return block;
 }
 
 void DCMFestwerteblock::ExportValues(CString& block) const
@@ -179,8 +178,8 @@ void DCMFestwerteblock::ExportValues2D(CString& block) const
 void DCMFestwerteblock::AppendItems(CString& block, int itemsPerLine, int digits) const
 {
     dcm::ItemLines lines(block, itemsPerLine);
-    if (!m_listDoubleValues.empty()) {
-        for (const double number : m_listDoubleValues)
+    if (!m_vecDoubleValues.empty()) {
+        for (const double number : m_vecDoubleValues)
             lines.AddNumber(dcm::keyword::kWert, number, digits);
     } else {
         for (const CString& text : m_listStringValues)
@@ -191,7 +190,7 @@ void DCMFestwerteblock::AppendItems(CString& block, int itemsPerLine, int digits
 
 void DCMFestwerteblock::AddValue(double dValue)
 {
-    m_listDoubleValues.push_back(dValue);
+    m_vecDoubleValues.push_back(dValue);
 }
 
 void DCMFestwerteblock::AddValue(const CString& strValue)

@@ -8,6 +8,7 @@
 #include <cstdint>
 #include <list>
 #include <string_view>
+#include <vector>
 
 /// One FESTWERTEBLOCK: a named list of values, or rows of equal length, with one unit. It holds
 /// numbers and texts apart; only the numbers are written when there are any.
@@ -42,7 +43,10 @@ public:
     void AddValue(const CString& strValue);
     /// Values row after row: GetYValueCount() rows of GetXValueCount() values; one list when
     /// either count is 0. A copy; changing it leaves the block as is.
-    std::list<double> GetDoubleValues() const { return m_listDoubleValues; }
+    std::list<double> GetDoubleValues() const
+    {
+        return {m_vecDoubleValues.begin(), m_vecDoubleValues.end()};
+    }
     /// The same for the texts: what TEXT lines hold, in order.
     std::list<CString> GetStringValues() const { return m_listStringValues; }
 
@@ -66,13 +70,15 @@ private:
     HRESULT AddValues(std::wstring_view rest);
     HRESULT AddTexts(std::wstring_view rest);
     HRESULT AddStringValues(std::wstring_view rest);
-    CString BlockText() const;
+    /// Composes the block in `block`, which is empty before.
+    void ComposeBlock(CString& block) const;
     void ExportValues(CString& block) const;
     void ExportValues2D(CString& block) const;
     void AppendItems(CString& block, int itemsPerLine, int digits) const;
 
     CString m_strUnit;
-    std::list<double> m_listDoubleValues;
+    /// Lists in the interface; an array here, since a list takes four times the memory.
+    std::vector<double> m_vecDoubleValues;
     std::list<CString> m_listStringValues;
     std::int32_t m_nXValueCount;
     std::int32_t m_nYValueCount;

@@ -30,22 +30,23 @@ HRESULT DCMKennfeld::Init(const CString& strBlock)
     dcm::BlockLines lines(strBlock);
     dcm::BlockLine line;
     while (lines.Next(line)) {
+        // Most lines of a file are lines of points.
+        if (TakePointLine(line.keyword, line.rest))
+            continue;
         if (line.Is(m_strKeyword))
             ReadFirstLine(dcm::TrimWhite(line.rest), strBlock);
-        else if (ReadAttribute(line.keyword, dcm::Unquoted(line.rest), line.rest))
+        else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnitX = dcm::Unquoted(line.rest);
+            m_strUnitX = dcm::TrimBlanksAndQuotes(line.rest);
         else if (line.Is(dcm::keyword::kEinheitY))
-            m_strUnitY = dcm::Unquoted(line.rest);
+            m_strUnitY = dcm::TrimBlanksAndQuotes(line.rest);
         else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnitW = dcm::Unquoted(line.rest);
+            m_strUnitW = dcm::TrimBlanksAndQuotes(line.rest);
         else if (line.Is(dcm::keyword::kSstX))
-            m_strStuetzstellenverteilungX = dcm::Trim(line.rest, L" ");
+            m_strStuetzstellenverteilungX = dcm::TrimBlanks(line.rest);
         else if (line.Is(dcm::keyword::kSstY))
-            m_strStuetzstellenverteilungY = dcm::Trim(line.rest, L" ");
-        else
-            AddValues(line.rest, line.keyword);
+            m_strStuetzstellenverteilungY = dcm::TrimBlanks(line.rest);
     }
     return S_OK;
 }
@@ -64,18 +65,25 @@ void DCMKennfeld::ReadFirstLine(std::wstring_view rest, std::wstring_view block)
 
 HRESULT DCMKennfeld::AddValues(std::wstring_view rest, std::wstring_view keyword)
 {
+    TakePointLine(keyword, rest);
+    return S_OK;
+}
+
+/// Reads a line of points or values; false for any other line.
+bool DCMKennfeld::TakePointLine(std::wstring_view keyword, std::wstring_view rest)
+{
     const dcm::PointTarget targets[] = {
         {dcm::kValues, {m_vecValues, m_vtValueType}},
         {dcm::kAxisX, {m_vecAxisX, m_vtAxisXType}},
         {dcm::kAxisY, {m_vecAxisY, m_vtAxisYType}},
     };
-    dcm::ReadPointLine(keyword, rest, targets);
-    return S_OK;
+    return dcm::ReadPointLine(keyword, rest, targets);
 }
 
 HRESULT DCMKennfeld::Export(PravFile& file)
 {
-    const CString block = BlockText();
+    CString block;
+    ComposeBlock(block);
     dcm::DropBlankUnit(m_strUnitX);
     dcm::DropBlankUnit(m_strUnitY);
     dcm::DropBlankUnit(m_strUnitW);
@@ -83,11 +91,9 @@ HRESULT DCMKennfeld::Export(PravFile& file)
     return S_OK;
 }
 
-/// The whole block; empty when it has no lines of points or values.
-CString DCMKennfeld::BlockText() const
+void DCMKennfeld::ComposeBlock(CString& block) const
 {
-    CString block = m_strKeyword;
-    block.Append(L" ").Append(GetName());
+    block.Append(m_strKeyword).Append(L" ").Append(GetName());
     const auto appendCount = [&](std::int32_t axisLength, std::size_t points) {
         if (axisLength > 0)
             dcm::AppendCount(block, axisLength);
@@ -105,10 +111,12 @@ CString DCMKennfeld::BlockText() const
     dcm::AppendSharedAxisLine(block, dcm::keyword::kSstY, m_strSharedYAxisUniqueName);
     const int head = block.GetLength();
     AppendValues(block);
-    if (block.GetLength() == head)
-        return {};
+    if (block.GetLength() == head) {
+        // Without lines of points or values nothing at all is written.
+        block.Empty();
+        return;
+    }
     dcm::AppendEnd(block);
-    return block;
 }
 
 CString DCMKennfeld::ExportValues(PravFile&) const

@@ -104,7 +104,9 @@ protected:
 private:
     friend class DCMConverter;
     void ReadFirstLine(std::wstring_view rest, std::wstring_view block);
-    CString BlockText() const;
+    bool TakePointLine(std::wstring_view keyword, std::wstring_view rest);
+    /// Composes the block in `block`, which is empty before.
+    void ComposeBlock(CString& block) const;
     void AppendValues(CString& block) const;
 
     CString m_strUnitX;

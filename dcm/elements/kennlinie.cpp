@@ -28,20 +28,21 @@ HRESULT DCMKennlinie::Init(const CString& strBlock)
     dcm::BlockLines lines(strBlock);
     dcm::BlockLine line;
     while (lines.Next(line)) {
+        // Most lines of a file are lines of points.
+        if (TakePointLine(line.keyword, line.rest))
+            continue;
         if (line.Is(m_strKeyword))
             ReadFirstLine(dcm::TrimWhite(line.rest), strBlock);
-        else if (ReadAttribute(line.keyword, dcm::Unquoted(line.rest), line.rest))
+        else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnitX = dcm::Unquoted(line.rest);
+            m_strUnitX = dcm::TrimBlanksAndQuotes(line.rest);
         else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnitW = dcm::Unquoted(line.rest);
+            m_strUnitW = dcm::TrimBlanksAndQuotes(line.rest);
         else if (line.Is(dcm::keyword::kStTxY))
             return E_FAIL;
         else if (line.Is(dcm::keyword::kSstX))
-            m_strStuetzstellenverteilung = dcm::Trim(line.rest, L" ");
-        else
-            AddValues(line.rest, line.keyword);
+            m_strStuetzstellenverteilung = dcm::TrimBlanks(line.rest);
     }
     return S_OK;
 }
@@ -57,27 +58,33 @@ void DCMKennlinie::ReadFirstLine(std::wstring_view rest, std::wstring_view block
 
 HRESULT DCMKennlinie::AddValues(std::wstring_view rest, std::wstring_view keyword)
 {
+    TakePointLine(keyword, rest);
+    return S_OK;
+}
+
+/// Reads a line of points or values; false for any other line.
+bool DCMKennlinie::TakePointLine(std::wstring_view keyword, std::wstring_view rest)
+{
     const dcm::PointTarget targets[] = {
         {dcm::kAxisX, {m_vecAxis, m_vtAxisType}},
         {dcm::kValues, {m_vecValues, m_vtValueType}},
     };
-    dcm::ReadPointLine(keyword, rest, targets);
-    return S_OK;
+    return dcm::ReadPointLine(keyword, rest, targets);
 }
 
 HRESULT DCMKennlinie::Export(PravFile& file)
 {
-    const CString block = BlockText();
+    CString block;
+    ComposeBlock(block);
     dcm::DropBlankUnit(m_strUnitX);
     dcm::DropBlankUnit(m_strUnitW);
     file.WriteText(block);
     return S_OK;
 }
 
-CString DCMKennlinie::BlockText() const
+void DCMKennlinie::ComposeBlock(CString& block) const
 {
-    CString block = m_strKeyword;
-    block.Append(L" ").Append(GetName());
+    block.Append(m_strKeyword).Append(L" ").Append(GetName());
     if (m_nAxisLengthX > 0)
         dcm::AppendCount(block, m_nAxisLengthX);
     else
@@ -89,7 +96,6 @@ CString DCMKennlinie::BlockText() const
     dcm::AppendSharedAxisLine(block, dcm::keyword::kSstX, m_strSharedAxisUniqueName);
     ExportValues(block);
     dcm::AppendEnd(block);
-    return block;
 }
 
 void DCMKennlinie::ExportValues(CString& block) const

@@ -81,15 +81,18 @@ void ReadPoints(std::wstring_view rest, const PointArray* numbers, const PointAr
     }
 }
 
-void ReadPointLine(std::wstring_view keyword, std::wstring_view rest,
+bool ReadPointLine(std::wstring_view keyword, std::wstring_view rest,
                    std::span<const PointTarget> targets)
 {
     for (const PointTarget& target : targets) {
-        if (EqualsNoCase(keyword, target.keywords.numbers))
-            return ReadPoints(rest, &target.array, nullptr);
-        if (EqualsNoCase(keyword, target.keywords.texts))
-            return ReadPoints(rest, nullptr, &target.array);
+        const bool numbers = EqualsNoCase(keyword, target.keywords.numbers);
+        if (numbers || EqualsNoCase(keyword, target.keywords.texts)) {
+            const PointArray* const array = &target.array;
+            ReadPoints(rest, numbers ? array : nullptr, numbers ? nullptr : array);
+            return true;
+        }
     }
+    return false;
 }
 
 void CopyPoints(const std::vector<CComVariant>& points, std::vector<CComVariant>& target)

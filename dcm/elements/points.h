@@ -55,9 +55,9 @@ struct PointTarget
     PointArray array;
 };
 
-/// Reads one point line into the target whose keyword it has, if any. Numbers under the keyword of
-/// texts are dropped, and the reverse.
-void ReadPointLine(std::wstring_view keyword, std::wstring_view rest,
+/// Reads one point line into the target whose keyword it has; false when it has none of them.
+/// Numbers under the keyword of texts are dropped, and the reverse.
+bool ReadPointLine(std::wstring_view keyword, std::wstring_view rest,
                    std::span<const PointTarget> targets);
 
 /// Writes the points of an array five to a line; those that are neither number nor text take no

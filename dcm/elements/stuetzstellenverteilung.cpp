@@ -29,10 +29,10 @@ HRESULT DCMStuetzstellenverteilung::Init(const CString& strBlock)
     while (lines.Next(line)) {
         if (line.Is(dcm::keyword::kStuetzstellenverteilung))
             ReadFirstLine(dcm::TrimWhite(line.rest), strBlock);
-        else if (ReadAttribute(line.keyword, dcm::Unquoted(line.rest), line.rest))
+        else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnit = dcm::Unquoted(line.rest);
+            m_strUnit = dcm::TrimBlanksAndQuotes(line.rest);
         else if (line.Is(dcm::keyword::kStX) || line.Is(dcm::keyword::kStTxX))
             AddValues(line.rest);
         else if (line.Is(dcm::keyword::kStTxY) || line.Is(dcm::keyword::kText))
@@ -58,23 +58,22 @@ HRESULT DCMStuetzstellenverteilung::AddValues(std::wstring_view rest)
 
 HRESULT DCMStuetzstellenverteilung::Export(PravFile& file)
 {
-    const CString block = BlockText();
+    CString block;
+    ComposeBlock(block);
     dcm::DropBlankUnit(m_strUnit);
     file.WriteText(block);
     return S_OK;
 }
 
-CString DCMStuetzstellenverteilung::BlockText() const
+void DCMStuetzstellenverteilung::ComposeBlock(CString& block) const
 {
-    CString block(dcm::keyword::kStuetzstellenverteilung);
-    block.Append(L" ").Append(GetName());
+    block.Append(dcm::keyword::kStuetzstellenverteilung).Append(L" ").Append(GetName());
     dcm::AppendCount(block, m_vecValues.size());
     block.Append(L"\n").Append(dcm::keyword::kSst).Append(L"\n");
     AppendAttributes(block);
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitX, m_strUnit);
     ExportValues(block);
     dcm::AppendEnd(block);
-    return block;
 }
 
 void DCMStuetzstellenverteilung::ExportValues(CString& block) const

@@ -59,7 +59,8 @@ private:
     friend class DCMConverter;
     void ReadFirstLine(std::wstring_view rest, std::wstring_view block);
     HRESULT AddValues(std::wstring_view rest);
-    CString BlockText() const;
+    /// Composes the block in `block`, which is empty before.
+    void ComposeBlock(CString& block) const;
     void ExportValues(CString& block) const;
 
     CString m_strUnit;

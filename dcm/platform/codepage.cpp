@@ -6,6 +6,7 @@
 #include <array>
 #include <cstdint>
 #include <cstring>
+#include <optional>
 #include <type_traits>
 #include <utility>
 
@@ -27,21 +28,18 @@ unsigned ThreadCodePage()
     return chosenCodePage != 0 ? chosenCodePage : system::DefaultCodePage();
 }
 
-/// Whether the page is built in, and as which encoding.
-bool FindEncoding(unsigned identifier, Encoding& encoding)
+/// The encoding of a page that is built in.
+std::optional<Encoding> FindEncoding(unsigned identifier)
 {
     switch (identifier) {
     case kWindows1252Identifier:
-        encoding = Encoding::kWindows1252;
-        return true;
+        return Encoding::kWindows1252;
     case kLatin1Identifier:
-        encoding = Encoding::kLatin1;
-        return true;
+        return Encoding::kLatin1;
     case kUtf8Identifier:
-        encoding = Encoding::kUtf8;
-        return true;
+        return Encoding::kUtf8;
     default:
-        return false;
+        return std::nullopt;
     }
 }
 
@@ -58,48 +56,95 @@ std::uint32_t Number(wchar_t c)
     return static_cast<std::uint32_t>(static_cast<std::make_unsigned_t<wchar_t>>(c));
 }
 
-/// As many characters as are looked at together: most text is ASCII and goes through in pieces.
-constexpr std::size_t kPiece = 16;
+/// As many characters as are looked at together: most text is ASCII and goes through in runs, in
+/// loops that compilers turn into vector code.
+constexpr std::size_t kPiece = 32;
 
-/// Widens ASCII from the start of `bytes` and returns how many bytes that were.
-std::size_t WidenAscii(std::string_view bytes, wchar_t* to)
+using Words = std::array<std::uint64_t, kPiece / sizeof(std::uint64_t)>;
+
+Words LoadPiece(const char* bytes)
 {
-    std::size_t done = 0;
-    while (bytes.size() - done >= kPiece) {
-        std::array<std::uint64_t, 2> words;
-        std::memcpy(words.data(), bytes.data() + done, kPiece);
-        if (((words[0] | words[1]) & 0x8080808080808080U) != 0)
-            break;
-        for (std::size_t i = 0; i < kPiece; ++i)
-            to[done + i] = static_cast<wchar_t>(static_cast<unsigned char>(bytes[done + i]));
-        done += kPiece;
-    }
-    while (done < bytes.size() && static_cast<unsigned char>(bytes[done]) < 0x80) {
-        to[done] = static_cast<wchar_t>(bytes[done]);
-        ++done;
-    }
-    return done;
+    Words words;
+    std::memcpy(words.data(), bytes, kPiece);
+    return words;
 }
 
-/// Narrows ASCII from the start of `text` and returns how many characters that were.
-std::size_t NarrowAscii(std::wstring_view text, char* to)
+/// Whether any byte lies above 0x7F.
+bool HasHigh(const Words& words)
 {
-    std::size_t done = 0;
-    while (text.size() - done >= kPiece) {
+    return ((words[0] | words[1] | words[2] | words[3]) & 0x8080808080808080U) != 0;
+}
+
+/// Whether any byte lies from 0x80 to 0x9F: of its upper three bits, only the first is set. The
+/// shifts bring the other two to its place.
+bool HasC1(const Words& words)
+{
+    std::uint64_t found = 0;
+    for (const std::uint64_t word : words)
+        found |= word & ~(word << 1) & ~(word << 2);
+    return (found & 0x8080808080808080U) != 0;
+}
+
+/// How many bytes of ASCII `bytes` begins with.
+std::size_t AsciiLength(std::string_view bytes)
+{
+    std::size_t length = 0;
+    while (bytes.size() - length >= kPiece && !HasHigh(LoadPiece(bytes.data() + length)))
+        length += kPiece;
+    while (length < bytes.size() && static_cast<unsigned char>(bytes[length]) < 0x80)
+        ++length;
+    return length;
+}
+
+/// How many characters of ASCII `text` begins with.
+std::size_t AsciiLength(std::wstring_view text)
+{
+    std::size_t length = 0;
+    while (text.size() - length >= kPiece) {
+        const wchar_t* const piece = text.data() + length;
         std::uint32_t all = 0;
         for (std::size_t i = 0; i < kPiece; ++i)
-            all |= Number(text[done + i]);
+            all |= Number(piece[i]);
         if (all >= 0x80)
             break;
-        for (std::size_t i = 0; i < kPiece; ++i)
-            to[done + i] = static_cast<char>(text[done + i]);
-        done += kPiece;
+        length += kPiece;
     }
-    while (done < text.size() && Number(text[done]) < 0x80) {
-        to[done] = static_cast<char>(text[done]);
-        ++done;
-    }
-    return done;
+    while (length < text.size() && Number(text[length]) < 0x80)
+        ++length;
+    return length;
+}
+
+/// Copies `count` characters whose numbers are the same in both widths.
+template <class From, class To>
+To* CopyNumbers(const From* from, std::size_t count, To* to)
+{
+    for (std::size_t i = 0; i < count; ++i)
+        to[i] = static_cast<To>(static_cast<std::make_unsigned_t<From>>(from[i]));
+    return to + count;
+}
+
+/// Gives the bytes from 0x80 to 0x9F, which have been widened to their own numbers, the characters
+/// that they stand for in Windows-1252.
+void Replace1252(std::string_view bytes, wchar_t* wide)
+{
+    const auto replace = [&](std::size_t begin, std::size_t end) {
+        for (std::size_t i = begin; i < end; ++i) {
+            const auto byte = static_cast<unsigned char>(bytes[i]);
+            if (byte >= 0x80 && byte < 0xA0)
+                wide[i] = static_cast<wchar_t>(kHigh1252[byte - 0x80U]);
+        }
+    };
+    if (bytes.size() < kPiece)
+        return replace(0, bytes.size());
+    const auto replacePiece = [&](std::size_t begin) {
+        const Words words = LoadPiece(bytes.data() + begin);
+        if (HasHigh(words) && HasC1(words))
+            replace(begin, begin + kPiece);
+    };
+    const std::size_t last = bytes.size() - kPiece;
+    for (std::size_t begin = 0; begin < last; begin += kPiece)
+        replacePiece(begin);
+    replacePiece(last);
 }
 
 /// One character at the start of `bytes` (not empty), its bytes taken off. A byte that begins no
@@ -147,6 +192,18 @@ wchar_t* PutWide(std::uint32_t c, wchar_t* to)
     }
     *to++ = static_cast<wchar_t>(c);
     return to;
+}
+
+wchar_t* WidenUtf8(std::string_view bytes, wchar_t* to)
+{
+    for (;;) {
+        const std::size_t ascii = AsciiLength(bytes);
+        to = CopyNumbers(bytes.data(), ascii, to);
+        bytes.remove_prefix(ascii);
+        if (bytes.empty())
+            return to;
+        to = PutWide(TakeUtf8(bytes), to);
+    }
 }
 
 /// One character at the start of `text` (not empty), taken off; a surrogate without its other half
@@ -201,42 +258,36 @@ char ToSingleByte(std::uint32_t c, Encoding encoding)
     return '?';
 }
 
-std::string NarrowBuiltIn(std::wstring_view text, Encoding encoding)
+/// The most bytes that a wide character takes. Two of 16 bits make a character of four bytes.
+std::size_t MostBytes(Encoding encoding)
 {
-    const bool utf8 = encoding == Encoding::kUtf8;
-    // At most four bytes a character in UTF-8: three where a wide character has 16 bits, as two of
-    // them make one of four bytes.
-    const std::size_t most = utf8 ? (sizeof(wchar_t) == 2 ? 3 : 4) : 1;
-    std::string bytes;
-    // ASCII fits in one byte a character; room for the rest is made when there is any.
-    bytes.resize(text.size());
-    std::size_t size = NarrowAscii(text, bytes.data());
-    text.remove_prefix(size);
-    if (most > 1 && !text.empty())
-        bytes.resize(size + text.size() * most);
-    while (!text.empty()) {
-        const std::uint32_t c = TakeWide(text);
-        char* const to = bytes.data() + size;
-        if (utf8)
-            size = static_cast<std::size_t>(PutUtf8(c, to) - bytes.data());
-        else {
-            *to = ToSingleByte(c, encoding);
-            ++size;
-        }
-        const std::size_t ascii = NarrowAscii(text, bytes.data() + size);
+    if (encoding != Encoding::kUtf8)
+        return 1;
+    return sizeof(wchar_t) == 2 ? 3 : 4;
+}
+
+/// Narrows all of `text` to where there is room for it and returns the end.
+char* NarrowTo(char* to, std::wstring_view text, Encoding encoding)
+{
+    for (;;) {
+        const std::size_t ascii = AsciiLength(text);
+        to = CopyNumbers(text.data(), ascii, to);
         text.remove_prefix(ascii);
-        size += ascii;
+        if (text.empty())
+            return to;
+        const std::uint32_t c = TakeWide(text);
+        if (encoding == Encoding::kUtf8)
+            to = PutUtf8(c, to);
+        else
+            *to++ = ToSingleByte(c, encoding);
     }
-    bytes.resize(size);
-    return bytes;
 }
 
 } // namespace
 
 bool SetThreadCodePage(unsigned identifier)
 {
-    Encoding encoding{};
-    if (!FindEncoding(identifier, encoding) && !system::KnowsCodePage(identifier))
+    if (!FindEncoding(identifier) && !system::KnowsCodePage(identifier))
         return false;
     chosenCodePage = identifier;
     return true;
@@ -245,12 +296,11 @@ bool SetThreadCodePage(unsigned identifier)
 FileText FileTextFromThreadCodePage(std::unique_ptr<char[]> bytes, std::size_t size)
 {
     const unsigned codePage = ThreadCodePage();
-    FileText text{std::move(bytes), size, Encoding::kUtf8};
-    if (FindEncoding(codePage, text.encoding))
-        return text;
-    const std::string utf8 = system::CodePageToUtf8(codePage, text.View());
-    text.bytes = std::make_unique_for_overwrite<char[]>(utf8.size());
-    text.size = utf8.size();
+    if (const auto encoding = FindEncoding(codePage))
+        return {std::move(bytes), size, *encoding};
+    const std::string utf8 = system::CodePageToUtf8(codePage, {bytes.get(), size});
+    FileText text{std::make_unique_for_overwrite<char[]>(utf8.size()), utf8.size(),
+                  Encoding::kUtf8};
     std::memcpy(text.bytes.get(), utf8.data(), utf8.size());
     return text;
 }
@@ -258,49 +308,61 @@ FileText FileTextFromThreadCodePage(std::unique_ptr<char[]> bytes, std::size_t s
 void AppendWide(CString& text, std::string_view bytes, Encoding encoding)
 {
     // No byte of any encoding gives more than one wide character.
-    wchar_t* to = text.Extend(bytes.size());
-    for (;;) {
-        const std::size_t ascii = WidenAscii(bytes, to);
-        bytes.remove_prefix(ascii);
-        to += ascii;
-        if (bytes.empty())
-            break;
-        if (encoding == Encoding::kUtf8) {
-            to = PutWide(TakeUtf8(bytes), to);
-            continue;
-        }
-        const auto byte = static_cast<unsigned char>(bytes[0]);
-        bytes.remove_prefix(1);
-        const bool mapped = encoding == Encoding::kWindows1252 && byte < 0xA0;
-        *to++ = static_cast<wchar_t>(mapped ? kHigh1252[byte - 0x80U] : byte);
+    wchar_t* const to = text.Extend(bytes.size());
+    if (encoding == Encoding::kUtf8) {
+        text.EndExtend(WidenUtf8(bytes, to));
+        return;
     }
-    text.EndExtend(to);
+    // ISO-8859-1 is how Unicode begins.
+    text.EndExtend(CopyNumbers(bytes.data(), bytes.size(), to));
+    if (encoding == Encoding::kWindows1252)
+        Replace1252(bytes, to);
 }
 
 CString Widen(std::string_view bytes)
 {
     const unsigned codePage = ThreadCodePage();
-    Encoding encoding = Encoding::kUtf8;
     CString text;
-    if (FindEncoding(codePage, encoding))
-        AppendWide(text, bytes, encoding);
+    if (const auto encoding = FindEncoding(codePage))
+        AppendWide(text, bytes, *encoding);
     else
         AppendWide(text, system::CodePageToUtf8(codePage, bytes), Encoding::kUtf8);
     return text;
 }
 
-std::string Narrow(std::wstring_view text)
+TextEncoder::TextEncoder(std::size_t most)
+    : m_codePage(ThreadCodePage()), m_encoding(FindEncoding(m_codePage))
 {
-    const unsigned codePage = ThreadCodePage();
-    Encoding encoding{};
-    if (FindEncoding(codePage, encoding))
-        return NarrowBuiltIn(text, encoding);
-    return system::WideToCodePage(codePage, text);
+    if (m_encoding)
+        m_bytes = std::make_unique_for_overwrite<char[]>(most * MostBytes(*m_encoding));
+    else
+        m_wide.Extend(most);
+}
+
+void TextEncoder::Append(std::wstring_view text)
+{
+    if (m_encoding) {
+        char* const to = m_bytes.get() + m_size;
+        m_size += static_cast<std::size_t>(NarrowTo(to, text, *m_encoding) - to);
+    } else {
+        m_wide.Append(text);
+    }
+}
+
+std::string_view TextEncoder::Finish()
+{
+    if (m_encoding)
+        return {m_bytes.get(), m_size};
+    m_converted = system::WideToCodePage(m_codePage, m_wide);
+    return m_converted;
 }
 
 std::string ToUtf8(std::wstring_view text)
 {
-    return NarrowBuiltIn(text, Encoding::kUtf8);
+    std::string bytes(text.size() * MostBytes(Encoding::kUtf8), '\0');
+    const char* const end = NarrowTo(bytes.data(), text, Encoding::kUtf8);
+    bytes.resize(static_cast<std::size_t>(end - bytes.data()));
+    return bytes;
 }
 
 CString FromUtf8(std::string_view text)

@@ -106,11 +106,10 @@ int CString::CompareNoCase(std::wstring_view other) const noexcept
 void CString::Empty() noexcept
 {
     // A shared text stays with its other owners.
-    if (IsStatic(*m_data) || m_data->references.load(std::memory_order_acquire) != 1) {
+    if (IsShared())
         *this = CString();
-        return;
-    }
-    EndExtend(m_data->Text());
+    else
+        EndExtend(m_data->Text());
 }
 
 CString& CString::Append(std::wstring_view text)
@@ -125,31 +124,17 @@ CString& CString::Append(std::wstring_view text)
     return *this;
 }
 
-wchar_t* CString::Extend(std::size_t room)
+void CString::MakeRoom(std::size_t room)
 {
     const auto length = static_cast<std::size_t>(m_data->length);
     const auto capacity = static_cast<std::size_t>(m_data->capacity);
     if (room > kMaxLength - length)
         dcm::ThrowResult(E_OUTOFMEMORY);
     // Half as much again, so that a text that grows piece by piece is copied a few times only.
-    if (length + room > capacity)
-        Grow(std::max(length + room, std::min(capacity + capacity / 2, kMaxLength)));
-    else if (m_data->references.load(std::memory_order_acquire) != 1)
-        Grow(capacity);
-    return m_data->Text() + length;
-}
-
-void CString::EndExtend(const wchar_t* end) noexcept
-{
-    wchar_t* const text = m_data->Text();
-    m_data->length = static_cast<std::int32_t>(end - text);
-    text[m_data->length] = L'\0';
-}
-
-void CString::Grow(std::size_t capacity)
-{
-    dcm::CStringData* const data = NewData(capacity);
-    std::wmemcpy(data->Text(), m_data->Text(), static_cast<std::size_t>(m_data->length) + 1);
+    const std::size_t grown =
+        length + room > capacity ? std::min(capacity + capacity / 2, kMaxLength) : capacity;
+    dcm::CStringData* const data = NewData(std::max(length + room, grown));
+    std::wmemcpy(data->Text(), m_data->Text(), length + 1);
     data->length = m_data->length;
     Release();
     m_data = data;

@@ -31,7 +31,7 @@ class TextConstant
 {
 public:
     /// Copies a literal, at compile time.
-    constexpr TextConstant(const wchar_t (&text)[N]) : m_data{-1, N - 1, 0}, m_text{}
+    constexpr TextConstant(const wchar_t (&text)[N]) : m_data{-1, N - 1, N - 1}, m_text{}
     {
         for (std::size_t i = 0; i < N; ++i)
             m_text[i] = text[i];
@@ -104,8 +104,18 @@ public:
 
     /// Makes room for `room` more characters behind the text and returns where they go; the text
     /// is only longer once `EndExtend` has been told where they end.
-    wchar_t* Extend(std::size_t room);
-    void EndExtend(const wchar_t* end) noexcept;
+    wchar_t* Extend(std::size_t room)
+    {
+        if (room > static_cast<std::size_t>(m_data->capacity - m_data->length) || IsShared())
+            MakeRoom(room);
+        return m_data->Text() + m_data->length;
+    }
+    void EndExtend(const wchar_t* end) noexcept
+    {
+        wchar_t* const text = m_data->Text();
+        m_data->length = static_cast<std::int32_t>(end - text);
+        text[m_data->length] = L'\0';
+    }
 
     /// One text behind the other; null counts as empty.
     friend CString operator+(const CString& a, const CString& b)
@@ -145,8 +155,12 @@ private:
     {
         return text == nullptr ? std::wstring_view() : std::wstring_view(text);
     }
+    bool IsShared() const noexcept
+    {
+        return m_data->references.load(std::memory_order_acquire) != 1;
+    }
     void Release() noexcept;
-    void Grow(std::size_t capacity);
+    void MakeRoom(std::size_t room);
 
     dcm::CStringData* m_data;
 };

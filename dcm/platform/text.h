@@ -25,37 +25,53 @@ constexpr bool EqualsNoCase(std::wstring_view a, std::wstring_view b)
                       [](wchar_t x, wchar_t y) { return x == y || FoldCase(x) == FoldCase(y); });
 }
 
-/// `text` without the white space at its start.
-constexpr std::wstring_view TrimLeftWhite(std::wstring_view text)
+/// `text` without the characters at its start for which `isTrimmed` holds.
+template <class Predicate>
+constexpr std::wstring_view TrimLeft(std::wstring_view text, Predicate isTrimmed)
 {
-    std::size_t start = 0;
-    while (start < text.size() && IsWhite(text[start]))
+    const wchar_t* const end = text.data() + text.size();
+    const wchar_t* start = text.data();
+    while (start != end && isTrimmed(*start))
         ++start;
-    return text.substr(start);
+    return {start, static_cast<std::size_t>(end - start)};
 }
 
-/// `text` without the white space at its end.
-constexpr std::wstring_view TrimRightWhite(std::wstring_view text)
+/// `text` without the characters at its end for which `isTrimmed` holds.
+template <class Predicate>
+constexpr std::wstring_view TrimRight(std::wstring_view text, Predicate isTrimmed)
 {
-    std::size_t end = text.size();
-    while (end > 0 && IsWhite(text[end - 1]))
+    const wchar_t* end = text.data() + text.size();
+    while (end != text.data() && isTrimmed(end[-1]))
         --end;
-    return text.substr(0, end);
+    return {text.data(), static_cast<std::size_t>(end - text.data())};
 }
 
-/// `text` without the white space at both ends.
+/// `text` without the characters at both ends for which `isTrimmed` holds.
+template <class Predicate>
+constexpr std::wstring_view Trim(std::wstring_view text, Predicate isTrimmed)
+{
+    return TrimRight(TrimLeft(text, isTrimmed), isTrimmed);
+}
+
 constexpr std::wstring_view TrimWhite(std::wstring_view text)
 {
-    return TrimRightWhite(TrimLeftWhite(text));
+    return Trim(text, IsWhite);
 }
 
-/// `text` without any of `characters` at both ends.
-constexpr std::wstring_view Trim(std::wstring_view text, std::wstring_view characters)
+constexpr std::wstring_view TrimBlanks(std::wstring_view text)
 {
-    const std::size_t start = text.find_first_not_of(characters);
-    if (start == text.npos)
-        return {};
-    return text.substr(start, text.find_last_not_of(characters) - start + 1);
+    return Trim(text, [](wchar_t c) { return c == L' '; });
+}
+
+constexpr std::wstring_view TrimQuotes(std::wstring_view text)
+{
+    return Trim(text, [](wchar_t c) { return c == L'"'; });
+}
+
+/// `text` without the blanks and double quotes at both ends, in any mix.
+constexpr std::wstring_view TrimBlanksAndQuotes(std::wstring_view text)
+{
+    return Trim(text, [](wchar_t c) { return c == L' ' || c == L'"'; });
 }
 
 } // namespace dcm

@@ -1,38 +1,9 @@
 #include "dcm/textfile/pravfile.h"
 
-#include <algorithm>
 #include <cstddef>
 #include <cstring>
 #include <memory>
-#include <string>
 #include <utility>
-
-namespace {
-
-/// `text` with CR LF as its only line end. A carriage return that no line feed follows stays.
-CString WithCrLf(std::wstring_view text)
-{
-    const auto lineFeeds = static_cast<std::size_t>(std::count(text.begin(), text.end(), L'\n'));
-    CString result;
-    wchar_t* to = result.Extend(text.size() + lineFeeds);
-    for (;;) {
-        const std::size_t end = text.find(L'\n');
-        std::wstring_view line = text.substr(0, end);
-        const bool paired = end != text.npos && line.ends_with(L'\r');
-        if (paired)
-            line.remove_suffix(1);
-        to = std::copy(line.begin(), line.end(), to);
-        if (end == text.npos)
-            break;
-        *to++ = L'\r';
-        *to++ = L'\n';
-        text.remove_prefix(end + 1);
-    }
-    result.EndExtend(to);
-    return result;
-}
-
-} // namespace
 
 PravFile::PravFile() noexcept : m_nReadPos(0)
 {}
@@ -68,15 +39,18 @@ void PravFile::LoadContent(UINT flags)
 
 bool PravFile::TakeLine(std::string_view& line)
 {
-    const auto start = static_cast<std::size_t>(m_nReadPos);
-    const std::string_view left = m_content.View().substr(start);
-    const std::size_t end = left.find('\n');
-    if (end == left.npos)
+    const char* const content = m_content.bytes.get();
+    const char* const start = content + m_nReadPos;
+    const char* const end = content + m_content.size;
+    const auto* const lineFeed =
+        static_cast<const char*>(std::memchr(start, '\n', static_cast<std::size_t>(end - start)));
+    if (lineFeed == nullptr)
         return false;
-    m_nReadPos = static_cast<std::int32_t>(start + end + 1);
-    line = left.substr(0, end);
-    while (line.ends_with('\r'))
-        line.remove_suffix(1);
+    m_nReadPos = static_cast<std::int32_t>(lineFeed + 1 - content);
+    const char* last = lineFeed;
+    while (last != start && last[-1] == '\r')
+        --last;
+    line = {start, last};
     return true;
 }
 
@@ -93,19 +67,42 @@ int PravFile::ReadLine(CString& line)
 bool PravFile::ReadBlock(CString& block)
 {
     block.Empty();
+    // The lines move together over the carriage returns between them, so that the block can be
+    // widened as one piece.
+    char* const start = m_content.bytes.get() + m_nReadPos;
+    char* end = start;
     std::string_view line;
     while (TakeLine(line)) {
-        if (line.empty())
+        if (line.empty()) {
+            dcm::AppendWide(block, {start, end}, m_content.encoding);
             return true;
-        dcm::AppendWide(block, line, m_content.encoding);
-        block += L"\n";
+        }
+        std::memmove(end, line.data(), line.size());
+        end += line.size();
+        *end++ = '\n';
     }
     return false;
 }
 
 int PravFile::WriteText(const CString& text)
 {
-    const std::string bytes = dcm::Narrow(WithCrLf(text));
+    std::wstring_view rest = text;
+    // A text of nothing but line feeds becomes twice as long.
+    dcm::TextEncoder encoder(2 * rest.size());
+    for (;;) {
+        const std::size_t end = rest.find(L'\n');
+        std::wstring_view line = rest.substr(0, end);
+        if (end == rest.npos) {
+            encoder.Append(line);
+            break;
+        }
+        if (line.ends_with(L'\r'))
+            line.remove_suffix(1);
+        encoder.Append(line);
+        encoder.Append(L"\r\n");
+        rest.remove_prefix(end + 1);
+    }
+    const std::string_view bytes = encoder.Finish();
     if (!bytes.empty())
         Write(bytes.data(), static_cast<UINT>(bytes.size()));
     return 1;

@@ -31,8 +31,8 @@ public:
     int ReadLine(CString& line);
 
     /// Hands out the lines up to the next empty one, each followed by one line feed; an empty
-    /// block where two empty lines meet. Returns false, with what is left in `block`, when no
-    /// further empty line follows.
+    /// block where two empty lines meet. Returns false, and an empty block, when no further empty
+    /// line follows: what is left is dropped.
     bool ReadBlock(CString& block);
 
     /// Writes `text` at the file's position in one piece: each line feed, with or without a
