@@ -19,6 +19,18 @@ quietly() {
     fi
 }
 
+# Runs a command as root, without questions.
+as_root() {
+    if ((EUID == 0)); then
+        env DEBIAN_FRONTEND=noninteractive "$@"
+    elif command -v sudo >/dev/null; then
+        sudo env DEBIAN_FRONTEND=noninteractive "$@"
+    else
+        echo "installing packages needs root or sudo: $*" >&2
+        return 1
+    fi
+}
+
 # Configures and builds the preset named.
 build() {
     quietly cmake --preset "$1"
