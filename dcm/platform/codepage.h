@@ -58,6 +58,7 @@ public:
     /// Makes room for `most` characters, which is as many as may be appended.
     explicit TextEncoder(std::size_t most);
 
+    /// Adds a text at the end.
     void Append(std::wstring_view text);
     /// The bytes of all that was appended; valid as long as the encoder is left alone.
     std::string_view Finish();
