@@ -1,23 +1,13 @@
 // A host that is the class library itself: the calls that the library makes when it is loaded and
-// unloaded arrive here.
+// unloaded arrive here. It ends with the number of the first promise not kept, 0 for none.
 #include "dcm/platform/module.h"
 
-#include <cstdio>
 #include <dlfcn.h>
 
 namespace {
 
 AFX_EXTENSION_MODULE* loaded = nullptr;
 int registrations = 0;
-int failures = 0;
-
-void Expect(bool condition, const char* what)
-{
-    if (!condition) {
-        std::printf("not so: %s\n", what);
-        ++failures;
-    }
-}
 
 } // namespace
 
@@ -29,10 +19,8 @@ BOOL AfxInitExtensionModule(AFX_EXTENSION_MODULE& state, void*) noexcept
 
 void AfxTermExtensionModule(AFX_EXTENSION_MODULE& state) noexcept
 {
-    Expect(loaded == &state, "the library ends the registration that it began");
     delete state.pLibrary;
-    state = {};
-    loaded = nullptr;
+    loaded = loaded == &state ? nullptr : loaded;
 }
 
 CDynLinkLibrary::CDynLinkLibrary(AFX_EXTENSION_MODULE& state) noexcept
@@ -51,14 +39,14 @@ int main()
 {
     for (int i = 0; i < 2; ++i) {
         void* const library = dlopen(DCM_LIBRARY, RTLD_NOW | RTLD_LOCAL);
-        if (library == nullptr) {
-            std::printf("%s\n", dlerror());
+        if (library == nullptr)
             return 1;
-        }
-        Expect(loaded != nullptr && registrations == 1, "loading registers the library");
-        Expect(dlclose(library) == 0, "the library is closed");
-        Expect(loaded == nullptr && registrations == 0, "unloading ends the registration");
-        Expect(dlopen(DCM_LIBRARY, RTLD_NOW | RTLD_NOLOAD) == nullptr, "the library is gone");
+        if (loaded == nullptr || registrations != 1)
+            return 2;
+        if (dlclose(library) != 0 || dlopen(DCM_LIBRARY, RTLD_NOW | RTLD_NOLOAD) != nullptr)
+            return 3;
+        if (loaded != nullptr || registrations != 0)
+            return 4;
     }
-    return failures == 0 ? 0 : 1;
+    return 0;
 }

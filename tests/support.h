@@ -11,8 +11,6 @@
 #include <string>
 #include <string_view>
 #include <system_error>
-#include <utility>
-#include <vector>
 
 /// How a failed comparison shows a text.
 inline void PrintTo(const CString& text, std::ostream* out)
@@ -22,6 +20,9 @@ inline void PrintTo(const CString& text, std::ostream* out)
 
 namespace test {
 
+inline constexpr UINT kRead = CFile::modeRead;
+inline constexpr UINT kCreate = CFile::modeCreate | CFile::modeWrite;
+
 /// A folder that goes with the object and all that is in it.
 class Folder
 {
@@ -29,9 +30,9 @@ public:
     Folder()
     {
         std::random_device random;
-        do {
+        do
             m_path = std::filesystem::temp_directory_path() / ("dcm" + std::to_string(random()));
-        } while (!std::filesystem::create_directory(m_path));
+        while (!std::filesystem::create_directory(m_path));
     }
     Folder(const Folder&) = delete;
     Folder& operator=(const Folder&) = delete;
@@ -41,10 +42,7 @@ public:
         std::filesystem::remove_all(m_path, ignored);
     }
 
-    CString operator/(const wchar_t* name) const
-    {
-        return CString(m_path.wstring()) + L"/" + CString(name);
-    }
+    CString operator/(const CString& name) const { return CString(m_path.wstring()) + L"/" + name; }
 
 private:
     std::filesystem::path m_path;
@@ -56,21 +54,17 @@ inline std::filesystem::path PathOf(const CString& path)
     return std::filesystem::path(std::u8string(utf8.begin(), utf8.end()));
 }
 
-inline std::string ReadBytes(const std::filesystem::path& path)
-{
-    std::ifstream file(path, std::ios::binary);
-    return std::string(std::istreambuf_iterator<char>(file), {});
-}
-
 inline std::string ReadBytes(const CString& path)
 {
-    return ReadBytes(PathOf(path));
+    std::ifstream file(PathOf(path), std::ios::binary);
+    return std::string(std::istreambuf_iterator<char>(file), {});
 }
 
 inline void WriteBytes(const CString& path, std::string_view bytes)
 {
-    std::ofstream file(PathOf(path), std::ios::binary);
-    file.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
+    // A new file: some file systems wait for the disk when one is emptied and written again.
+    std::filesystem::remove(PathOf(path));
+    std::ofstream(PathOf(path), std::ios::binary) << bytes;
 }
 
 /// Every `from` in `text` as `to`.
@@ -81,21 +75,12 @@ inline std::string Replaced(std::string text, std::string_view from, std::string
     return text;
 }
 
-/// A new block that has read `text`.
-template <class Block>
-Block Parsed(std::string_view text)
-{
-    Block block;
-    block.Init(dcm::Widen(text));
-    return block;
-}
-
 /// What a block writes, with single line feeds. `block` is changed as its export changes it.
 template <class Block>
 std::string Written(Block&& block)
 {
     const Folder folder;
-    PravFile file(folder / L"block", CFile::modeCreate | CFile::modeWrite);
+    PravFile file(folder / L"block", kCreate);
     if (block.Export(file) != S_OK)
         return "failed";
     file.Close();
@@ -110,11 +95,16 @@ inline HRESULT ImportBytes(DCMConverter& document, std::string_view bytes)
     return document.Import(folder / L"in.dcm");
 }
 
-/// The bytes of the document's file; "failed" when it could not be written.
+/// The bytes of the document's file.
 inline std::string ExportBytes(const DCMConverter& document)
 {
     const Folder folder;
     return document.Export(folder / L"out.dcm") == S_OK ? ReadBytes(folder / L"out.dcm") : "failed";
+}
+
+inline std::string Show(const CString& text)
+{
+    return "'" + dcm::ToUtf8(text) + "'";
 }
 
 /// The shortest text of a number, whatever the locale.
@@ -124,19 +114,14 @@ inline std::string Show(double value)
     return {text, std::to_chars(text, text + sizeof text, value).ptr};
 }
 
-/// A number as it is, a text in single quotes ('-' for an absent one), else the tag in brackets.
+/// A number as it is, a text in single quotes (just "-" when absent), else the tag in brackets.
 inline std::string Show(const VARIANT& value)
 {
     if (value.vt == VT_R8)
         return Show(value.dblVal);
-    if (value.vt == VT_BSTR)
-        return value.bstrVal == nullptr ? "-" : "'" + dcm::ToUtf8(CComVariant::TextOf(value)) + "'";
-    return "[" + std::to_string(value.vt) + "]";
-}
-
-inline std::string Show(const CString& text)
-{
-    return "'" + dcm::ToUtf8(text) + "'";
+    if (value.vt != VT_BSTR)
+        return "[" + std::to_string(value.vt) + "]";
+    return value.bstrVal == nullptr ? "-" : Show(CString(CComVariant::TextOf(value)));
 }
 
 /// The items of a list, one blank between two.
@@ -150,11 +135,14 @@ std::string ShowAll(const List& items)
 }
 
 /// The items that a getter fills an array with, which had other content before.
-template <class Block>
-std::string Points(const Block& block, HRESULT (Block::*getter)(std::vector<CComVariant>&) const)
+template <class Block, class Getter>
+std::string Points(const Block& block, Getter getter)
 {
     std::vector<CComVariant> points{L"before", 1.0};
     return (block.*getter)(points) == S_OK ? ShowAll(points) : "failed";
 }
+
+/// A getter of points, where other functions have its name too.
+using PointsOfCurve = HRESULT (DCMKennlinie::*)(std::vector<CComVariant>&) const;
 
 } // namespace test
