@@ -91,9 +91,9 @@ void Check(const Case& expected)
     Block block;
     Fields fields;
     const auto code = [](HRESULT result) {
-        std::ostringstream text;
-        text << std::hex << static_cast<unsigned>(result);
-        return result == S_OK ? "" : text.str();
+        char text[8];
+        const auto end = std::to_chars(text, text + 8, static_cast<unsigned>(result), 16).ptr;
+        return result == S_OK ? std::string() : std::string(text, end);
     };
     try {
         fields.Add("returns", code(block.Init(dcm::Widen(expected.input))));
