@@ -16,9 +16,7 @@ namespace {
 
 std::string Narrow(std::wstring_view text)
 {
-    dcm::TextEncoder encoder(text.size());
-    encoder.Append(text);
-    return std::string(encoder.Finish());
+    return std::string(dcm::ToThreadCodePage(dcm::FileTextFromWide(text)).View());
 }
 
 const wchar_t* Address(const CString& text)

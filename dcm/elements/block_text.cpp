@@ -15,6 +15,11 @@ constexpr std::wstring_view kIndent = L"    ";
 /// What follows a number that shares its line with others.
 constexpr std::wstring_view kNumberTrailer = L"   ";
 
+constexpr std::wstring_view kBlank = L" ";
+constexpr std::wstring_view kLineEnd = L"\n";
+constexpr std::wstring_view kOpeningQuote = L" \"";
+constexpr std::wstring_view kClosingQuote = L"\"\n";
+
 wchar_t* Put(std::wstring_view text, wchar_t* to)
 {
     return std::copy(text.begin(), text.end(), to);
@@ -24,19 +29,20 @@ wchar_t* Put(std::wstring_view text, wchar_t* to)
 
 void BeginLine(CString& block, std::wstring_view keyword)
 {
-    block.Append(kIndent).Append(keyword);
+    wchar_t* const to = block.Extend(kIndent.size() + keyword.size());
+    block.EndExtend(Put(keyword, Put(kIndent, to)));
 }
 
 void AppendLine(CString& block, std::wstring_view keyword, std::wstring_view value)
 {
     BeginLine(block, keyword);
-    block.Append(L" ").Append(value).Append(L"\n");
+    block.Append(kBlank).Append(value).Append(kLineEnd);
 }
 
 void AppendQuotedLine(CString& block, std::wstring_view keyword, std::wstring_view value)
 {
     BeginLine(block, keyword);
-    block.Append(L" \"").Append(value).Append(L"\"\n");
+    block.Append(kOpeningQuote).Append(value).Append(kClosingQuote);
 }
 
 void AppendUnitLine(CString& block, std::wstring_view keyword, std::wstring_view unit)
@@ -92,7 +98,7 @@ void ItemLines::AddText(std::wstring_view keyword, std::wstring_view text,
 void ItemLines::EndLine()
 {
     if (m_items > 0)
-        m_block += L"\n";
+        m_block.Append(kLineEnd);
     m_items = 0;
 }
 

@@ -15,7 +15,7 @@ bool KnowsCodePage(unsigned identifier);
 /// Text of the code page as UTF-8; bytes that are no character become U+FFFD.
 std::string CodePageToUtf8(unsigned identifier, std::string_view bytes);
 
-/// Wide text in the code page; a character that the page lacks becomes `?`.
-std::string WideToCodePage(unsigned identifier, std::wstring_view text);
+/// Text in UTF-8 in the code page; a character that the page lacks becomes `?`.
+std::string Utf8ToCodePage(unsigned identifier, std::string_view utf8);
 
 } // namespace dcm::system

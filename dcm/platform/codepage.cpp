@@ -283,6 +283,14 @@ char* NarrowTo(char* to, std::wstring_view text, Encoding encoding)
     }
 }
 
+FileText Copy(const std::string& utf8)
+{
+    FileText text{std::make_unique_for_overwrite<char[]>(utf8.size()), utf8.size(),
+                  Encoding::kUtf8};
+    std::memcpy(text.bytes.get(), utf8.data(), utf8.size());
+    return text;
+}
+
 } // namespace
 
 bool SetThreadCodePage(unsigned identifier)
@@ -298,11 +306,24 @@ FileText FileTextFromThreadCodePage(std::unique_ptr<char[]> bytes, std::size_t s
     const unsigned codePage = ThreadCodePage();
     if (const auto encoding = FindEncoding(codePage))
         return {std::move(bytes), size, *encoding};
-    const std::string utf8 = system::CodePageToUtf8(codePage, {bytes.get(), size});
-    FileText text{std::make_unique_for_overwrite<char[]>(utf8.size()), utf8.size(),
-                  Encoding::kUtf8};
-    std::memcpy(text.bytes.get(), utf8.data(), utf8.size());
-    return text;
+    return Copy(system::CodePageToUtf8(codePage, {bytes.get(), size}));
+}
+
+FileText FileTextFromWide(std::wstring_view text)
+{
+    const Encoding encoding = FindEncoding(ThreadCodePage()).value_or(Encoding::kUtf8);
+    auto bytes = std::make_unique_for_overwrite<char[]>(text.size() * MostBytes(encoding));
+    const char* const end = NarrowTo(bytes.get(), text, encoding);
+    const auto size = static_cast<std::size_t>(end - bytes.get());
+    return {std::move(bytes), size, encoding};
+}
+
+FileText ToThreadCodePage(FileText text)
+{
+    const unsigned codePage = ThreadCodePage();
+    if (FindEncoding(codePage))
+        return text;
+    return Copy(system::Utf8ToCodePage(codePage, text.View()));
 }
 
 void AppendWide(CString& text, std::string_view bytes, Encoding encoding)
@@ -328,33 +349,6 @@ CString Widen(std::string_view bytes)
     else
         AppendWide(text, system::CodePageToUtf8(codePage, bytes), Encoding::kUtf8);
     return text;
-}
-
-TextEncoder::TextEncoder(std::size_t most)
-    : m_codePage(ThreadCodePage()), m_encoding(FindEncoding(m_codePage))
-{
-    if (m_encoding)
-        m_bytes = std::make_unique_for_overwrite<char[]>(most * MostBytes(*m_encoding));
-    else
-        m_wide.Extend(most);
-}
-
-void TextEncoder::Append(std::wstring_view text)
-{
-    if (m_encoding) {
-        char* const to = m_bytes.get() + m_size;
-        m_size += static_cast<std::size_t>(NarrowTo(to, text, *m_encoding) - to);
-    } else {
-        m_wide.Append(text);
-    }
-}
-
-std::string_view TextEncoder::Finish()
-{
-    if (m_encoding)
-        return {m_bytes.get(), m_size};
-    m_converted = system::WideToCodePage(m_codePage, m_wide);
-    return m_converted;
 }
 
 std::string ToUtf8(std::wstring_view text)

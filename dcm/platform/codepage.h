@@ -5,7 +5,6 @@
 
 #include <cstddef>
 #include <memory>
-#include <optional>
 #include <string>
 #include <string_view>
 
@@ -28,7 +27,7 @@ enum class Encoding : unsigned char
     kUtf8,
 };
 
-/// The bytes of a text file in an encoding that can be cut.
+/// The bytes of a text file, in an encoding that can be cut.
 struct FileText
 {
     /// `size` bytes in `encoding`, owned.
@@ -50,29 +49,13 @@ void AppendWide(CString& text, std::string_view bytes, Encoding encoding);
 /// The wide form of `bytes` in the thread's code page.
 CString Widen(std::string_view bytes);
 
-/// Composes text in the thread's code page, piece by piece; a character that the page lacks becomes
-/// `?`.
-class TextEncoder
-{
-public:
-    /// Makes room for `most` characters, which is as many as may be appended.
-    explicit TextEncoder(std::size_t most);
+/// The other way: `text` in the thread's code page where that can be cut, in UTF-8 otherwise. A
+/// character that the encoding lacks becomes `?`.
+FileText FileTextFromWide(std::wstring_view text);
 
-    /// Adds a text at the end.
-    void Append(std::wstring_view text);
-    /// The bytes of all that was appended; valid as long as the encoder is left alone.
-    std::string_view Finish();
-
-private:
-    unsigned m_codePage;
-    /// None for a page that only the system converts.
-    std::optional<Encoding> m_encoding;
-    std::unique_ptr<char[]> m_bytes;
-    std::size_t m_size = 0;
-    /// What is appended in such a page; the system converts it as a whole.
-    CString m_wide;
-    std::string m_converted;
-};
+/// The bytes for the file: those of `text`, or what UTF-8 becomes in a code page that cannot be
+/// cut.
+FileText ToThreadCodePage(FileText text);
 
 /// `text` in UTF-8, and the wide form of a text in UTF-8; what is no character becomes U+FFFD.
 DCM_API std::string ToUtf8(std::wstring_view text);

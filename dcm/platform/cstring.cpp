@@ -114,13 +114,13 @@ void CString::Empty() noexcept
 
 CString& CString::Append(std::wstring_view text)
 {
-    if (text.empty())
-        return *this;
-    // `text` may be a part of this string, whose memory Extend can replace.
-    const CString keep(text.data() >= m_data->Text() && text.data() <= m_data->Text() + GetLength()
-                           ? *this
-                           : CString());
-    EndExtend(std::copy(text.begin(), text.end(), Extend(text.size())));
+    if (text.size() <= static_cast<std::size_t>(m_data->capacity - m_data->length) && !IsShared()) {
+        EndExtend(std::copy(text.begin(), text.end(), m_data->Text() + m_data->length));
+    } else if (!text.empty()) {
+        // `text` may be a part of this string: its memory has to outlive the move to a larger one.
+        const CString keep(*this);
+        EndExtend(std::copy(text.begin(), text.end(), Extend(text.size())));
+    }
     return *this;
 }
 

@@ -1,9 +1,37 @@
 #include "dcm/textfile/pravfile.h"
 
+#include <algorithm>
 #include <cstddef>
 #include <cstring>
 #include <memory>
 #include <utility>
+
+namespace {
+
+/// `text` with CR LF as its only line end. A carriage return that no line feed follows stays.
+dcm::FileText WithCrLf(const dcm::FileText& text)
+{
+    std::string_view rest = text.View();
+    // A text of nothing but line feeds becomes twice as long.
+    dcm::FileText result{std::make_unique_for_overwrite<char[]>(2 * rest.size()), 0, text.encoding};
+    char* to = result.bytes.get();
+    for (;;) {
+        const std::size_t end = rest.find('\n');
+        std::string_view line = rest.substr(0, end);
+        if (end != rest.npos && line.ends_with('\r'))
+            line.remove_suffix(1);
+        to = std::copy(line.begin(), line.end(), to);
+        if (end == rest.npos)
+            break;
+        *to++ = '\r';
+        *to++ = '\n';
+        rest.remove_prefix(end + 1);
+    }
+    result.size = static_cast<std::size_t>(to - result.bytes.get());
+    return result;
+}
+
+} // namespace
 
 PravFile::PravFile() noexcept : m_nReadPos(0)
 {}
@@ -86,24 +114,8 @@ bool PravFile::ReadBlock(CString& block)
 
 int PravFile::WriteText(const CString& text)
 {
-    std::wstring_view rest = text;
-    // A text of nothing but line feeds becomes twice as long.
-    dcm::TextEncoder encoder(2 * rest.size());
-    for (;;) {
-        const std::size_t end = rest.find(L'\n');
-        std::wstring_view line = rest.substr(0, end);
-        if (end == rest.npos) {
-            encoder.Append(line);
-            break;
-        }
-        if (line.ends_with(L'\r'))
-            line.remove_suffix(1);
-        encoder.Append(line);
-        encoder.Append(L"\r\n");
-        rest.remove_prefix(end + 1);
-    }
-    const std::string_view bytes = encoder.Finish();
-    if (!bytes.empty())
-        Write(bytes.data(), static_cast<UINT>(bytes.size()));
+    const dcm::FileText bytes = dcm::ToThreadCodePage(WithCrLf(dcm::FileTextFromWide(text)));
+    if (bytes.size > 0)
+        Write(bytes.bytes.get(), static_cast<UINT>(bytes.size));
     return 1;
 }

@@ -11,6 +11,8 @@ namespace dcm::system {
 
 namespace {
 
+constexpr const char* kUtf8 = "UTF-8";
+
 /// The C library's names of the code pages begin with "CP", those of a few with other words.
 std::string NameOf(unsigned identifier)
 {
@@ -30,7 +32,7 @@ std::string NameOf(unsigned identifier)
     }
 }
 
-/// An open conversion of the C library.
+/// A conversion of the C library. Pages that it knows fail to open for want of memory or files.
 class Conversion
 {
 public:
@@ -47,22 +49,22 @@ public:
 
     bool IsOpen() const { return m_handle != reinterpret_cast<iconv_t>(-1); }
 
-    /// Converts `size` bytes at `from`; units of `unit` bytes that cannot be converted become
-    /// `substitute`.
-    std::string Convert(const void* from, std::size_t size, std::size_t unit,
-                        std::string_view substitute)
+    /// Converts all of `text`; what cannot be converted becomes `substitute`, character by
+    /// character in UTF-8, otherwise byte by byte.
+    std::string Convert(std::string_view text, std::string_view substitute, bool isUtf8)
     {
         std::string result;
         // The C library takes the input as not constant but does not write to it.
-        char* in = static_cast<char*>(const_cast<void*>(from));
-        std::size_t left = size;
+        char* in = const_cast<char*>(text.data());
+        std::size_t left = text.size();
         while (left > 0) {
             if (Step(&in, &left, result))
                 continue;
             result += substitute;
-            const std::size_t skipped = unit < left ? unit : left;
-            in += skipped;
-            left -= skipped;
+            do {
+                ++in;
+                --left;
+            } while (isUtf8 && left > 0 && (static_cast<unsigned char>(*in) & 0xC0U) == 0x80);
         }
         // A page with shift states ends in its first state.
         Step(nullptr, nullptr, result);
@@ -73,6 +75,8 @@ private:
     /// Converts as much as fits into one piece. Returns false at a unit that cannot be converted.
     bool Step(char** in, std::size_t* left, std::string& result)
     {
+        if (!IsOpen())
+            ThrowResult(E_OUTOFMEMORY);
         std::array<char, 4096> piece;
         char* out = piece.data();
         std::size_t room = piece.size();
@@ -97,28 +101,19 @@ unsigned DefaultCodePage()
 bool KnowsCodePage(unsigned identifier)
 {
     const std::string name = NameOf(identifier);
-    return Conversion("WCHAR_T", name).IsOpen() && Conversion(name, "WCHAR_T").IsOpen();
+    return Conversion(kUtf8, name).IsOpen() && Conversion(name, kUtf8).IsOpen();
 }
 
 std::string CodePageToUtf8(unsigned identifier, std::string_view bytes)
 {
-    Conversion conversion("UTF-8", NameOf(identifier));
-    if (!conversion.IsOpen())
-        ThrowResult(E_OUTOFMEMORY);
-    return conversion.Convert(bytes.data(), bytes.size(), 1, "\xEF\xBF\xBD");
+    return Conversion(kUtf8, NameOf(identifier)).Convert(bytes, "\xEF\xBF\xBD", false);
 }
 
-std::string WideToCodePage(unsigned identifier, std::wstring_view text)
+std::string Utf8ToCodePage(unsigned identifier, std::string_view utf8)
 {
     const std::string name = NameOf(identifier);
-    Conversion conversion(name, "WCHAR_T");
-    if (!conversion.IsOpen())
-        ThrowResult(E_OUTOFMEMORY);
-    const std::wstring_view mark = L"?";
-    const std::string substitute =
-        Conversion(name, "WCHAR_T").Convert(mark.data(), sizeof(wchar_t), sizeof(wchar_t), "?");
-    return conversion.Convert(text.data(), text.size() * sizeof(wchar_t), sizeof(wchar_t),
-                              substitute);
+    const std::string substitute = Conversion(name, kUtf8).Convert("?", "?", true);
+    return Conversion(name, kUtf8).Convert(utf8, substitute, true);
 }
 
 } // namespace dcm::system
