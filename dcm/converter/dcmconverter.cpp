@@ -5,6 +5,8 @@
 #include "dcm/textfile/pravfile.h"
 
 #include <algorithm>
+#include <cstddef>
+#include <iterator>
 #include <string_view>
 #include <utility>
 
@@ -246,8 +248,8 @@ HRESULT DCMConverter::Export(const CString& strPath) const
             result = WriteFormat(file);
             for (const BlockKind& kind : kBlockKinds)
                 result = (this->*kind.write)(file);
+            file.Close();
         }
-        file.Close();
         return result;
     } catch (...) {
         return E_UNEXPECTED;

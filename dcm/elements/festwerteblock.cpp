@@ -170,6 +170,7 @@ void DCMFestwerteblock::ExportValues(CString& block) const
         AppendItems(block, dcm::kItemsPerLine, dcm::kFullDigits);
 }
 
+/// A row a line, whatever the number of rows.
 void DCMFestwerteblock::ExportValues2D(CString& block) const
 {
     AppendItems(block, m_nXValueCount, dcm::kShortDigits);

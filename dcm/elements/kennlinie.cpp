@@ -29,7 +29,7 @@ HRESULT DCMKennlinie::Init(const CString& strBlock)
     dcm::BlockLine line;
     while (lines.Next(line)) {
         // Most lines of a file are lines of points.
-        if (TakePointLine(line.keyword, line.rest))
+        if (AddValues(line.rest, line.keyword))
             continue;
         if (line.Is(m_strKeyword))
             ReadFirstLine(dcm::TrimWhite(line.rest), strBlock);
@@ -56,14 +56,8 @@ void DCMKennlinie::ReadFirstLine(std::wstring_view rest, std::wstring_view block
     dcm::ReservePoints(m_vecValues, m_nAxisLengthX, block);
 }
 
-HRESULT DCMKennlinie::AddValues(std::wstring_view rest, std::wstring_view keyword)
-{
-    TakePointLine(keyword, rest);
-    return S_OK;
-}
-
 /// Reads a line of points or values; false for any other line.
-bool DCMKennlinie::TakePointLine(std::wstring_view keyword, std::wstring_view rest)
+bool DCMKennlinie::AddValues(std::wstring_view rest, std::wstring_view keyword)
 {
     const dcm::PointTarget targets[] = {
         {dcm::kAxisX, {m_vecAxis, m_vtAxisType}},

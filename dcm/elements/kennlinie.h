@@ -89,8 +89,7 @@ public:
 private:
     friend class DCMConverter;
     void ReadFirstLine(std::wstring_view rest, std::wstring_view block);
-    bool TakePointLine(std::wstring_view keyword, std::wstring_view rest);
-    HRESULT AddValues(std::wstring_view rest, std::wstring_view keyword);
+    bool AddValues(std::wstring_view rest, std::wstring_view keyword);
     /// Composes the block in `block`, which is empty before.
     void ComposeBlock(CString& block) const;
     void ExportValues(CString& block) const;

@@ -20,6 +20,11 @@ VARTYPE TypeWith(VARTYPE type, VARTYPE added)
     return VT_ERROR;
 }
 
+bool KeepsValue(VARTYPE type)
+{
+    return type == VT_R8 || type == VT_R4 || type == VT_BSTR;
+}
+
 void ReadNumbers(std::wstring_view rest, const PointArray& array)
 {
     bool more = !rest.empty();
@@ -50,14 +55,22 @@ void ReadTexts(std::wstring_view rest, const PointArray& array)
 
 void AppendPoint(const PointArray& array, const VARIANT& point)
 {
+    CComVariant copy;
+    if (KeepsValue(point.vt))
+        copy = point;
+    else
+        copy.vt = point.vt;
+    AppendPoint(array, std::move(copy));
+}
+
+void AppendPoint(const PointArray& array, CComVariant&& point)
+{
     const VARTYPE type = TypeWith(array.type, point.vt);
-    if (type == VT_R8 || type == VT_R4 || type == VT_BSTR) {
-        array.points.emplace_back(point);
-    } else {
-        CComVariant withoutValue;
-        withoutValue.vt = type;
-        array.points.push_back(std::move(withoutValue));
+    if (!KeepsValue(type)) {
+        point = CComVariant();
+        point.vt = type;
     }
+    array.points.push_back(std::move(point));
     array.type = type;
 }
 

@@ -24,6 +24,8 @@ struct PointArray
 /// Appends a point under the array's type. Its value is kept for `VT_R8`, `VT_R4` and `VT_BSTR` (a
 /// text of its own); a point of any other type, `VT_ERROR` included, has no value.
 void AppendPoint(const PointArray& array, const VARIANT& point);
+/// The same with a point whose text becomes the array's own.
+void AppendPoint(const PointArray& array, CComVariant&& point);
 
 /// Makes room for as many points as the block announces, but not for more than its text can hold.
 void ReservePoints(std::vector<CComVariant>& points, long long count, std::wstring_view block);

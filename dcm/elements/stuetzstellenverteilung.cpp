@@ -83,7 +83,7 @@ void DCMStuetzstellenverteilung::ExportValues(CString& block) const
 
 HRESULT DCMStuetzstellenverteilung::AddValue(CComVariant value)
 {
-    dcm::AppendPoint({m_vecValues, m_vtValueType}, value);
+    dcm::AppendPoint({m_vecValues, m_vtValueType}, std::move(value));
     return S_OK;
 }
 

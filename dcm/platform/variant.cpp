@@ -2,6 +2,8 @@
 
 #include "dcm/platform/exception.h"
 
+#include <cstddef>
+#include <cstring>
 #include <limits>
 
 CComVariant::CComVariant(const wchar_t* text) : VARIANT{}
@@ -40,13 +42,13 @@ std::wstring_view CComVariant::TextOf(const VARIANT& variant) noexcept
 
 void CComVariant::SetText(std::wstring_view text)
 {
-    VariantClear(this);
-    VariantInit(this);
     BSTR copy = nullptr;
     if (text.size() <= std::numeric_limits<UINT>::max())
         copy = SysAllocStringLen(text.data(), static_cast<UINT>(text.size()));
+    VariantClear(this);
     if (copy == nullptr)
         Fail(E_OUTOFMEMORY);
+    VariantInit(this);
     vt = VT_BSTR;
     bstrVal = copy;
 }
@@ -61,7 +63,9 @@ VARIANT CComVariant::Detach() noexcept
 void CComVariant::OwnCopy()
 {
     // Nothing to copy, whatever the tag: an absent text, a point without a value.
-    if (llVal == 0)
+    constexpr std::size_t head = offsetof(VARIANT, llVal);
+    const VARIANT nothing = {};
+    if (std::memcmp(&llVal, &nothing.llVal, sizeof(VARIANT) - head) == 0)
         return;
     const VARIANT other = *this;
     VariantInit(this);

@@ -3,10 +3,19 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstring>
+#include <limits>
 #include <memory>
 #include <utility>
 
 namespace {
+
+/// Text of 2 GiB and more has no place in a file of this format; UTF-8 may become that long where
+/// the file is not.
+void CheckSize(ULONGLONG size)
+{
+    if (size > std::numeric_limits<std::int32_t>::max())
+        throw CFileException(CFileException::fileTooLarge, 0, CString());
+}
 
 /// `text` with CR LF as its only line end. A carriage return that no line feed follows stays.
 dcm::FileText WithCrLf(const dcm::FileText& text)
@@ -57,12 +66,15 @@ void PravFile::LoadContent(UINT flags)
     CFileStatus status;
     if (!GetStatus(status) || (flags & modeWrite) != 0)
         return;
-    const auto length = static_cast<UINT>(GetLength());
+    const ULONGLONG length = GetLength();
+    CheckSize(length);
     auto bytes = std::make_unique_for_overwrite<char[]>(length);
-    std::size_t size = Read(bytes.get(), length);
+    std::size_t size = Read(bytes.get(), static_cast<UINT>(length));
     if (const void* const zero = std::memchr(bytes.get(), '\0', size))
         size = static_cast<std::size_t>(static_cast<const char*>(zero) - bytes.get());
-    m_content = dcm::FileTextFromThreadCodePage(std::move(bytes), size);
+    dcm::FileText content = dcm::FileTextFromThreadCodePage(std::move(bytes), size);
+    CheckSize(content.size);
+    m_content = std::move(content);
 }
 
 bool PravFile::TakeLine(std::string_view& line)
@@ -70,6 +82,8 @@ bool PravFile::TakeLine(std::string_view& line)
     const char* const content = m_content.bytes.get();
     const char* const start = content + m_nReadPos;
     const char* const end = content + m_content.size;
+    if (start == end)
+        return false;
     const auto* const lineFeed =
         static_cast<const char*>(std::memchr(start, '\n', static_cast<std::size_t>(end - start)));
     if (lineFeed == nullptr)
@@ -115,6 +129,7 @@ bool PravFile::ReadBlock(CString& block)
 int PravFile::WriteText(const CString& text)
 {
     const dcm::FileText bytes = dcm::ToThreadCodePage(WithCrLf(dcm::FileTextFromWide(text)));
+    CheckSize(bytes.size);
     if (bytes.size > 0)
         Write(bytes.bytes.get(), static_cast<UINT>(bytes.size));
     return 1;

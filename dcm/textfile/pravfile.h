@@ -49,8 +49,8 @@ private:
     /// Cuts the next line off, without its line feed and the carriage returns before that.
     bool TakeLine(std::string_view& line);
 
-    /// The bytes as they stand in the file: wide text takes four times the memory, so each line is
-    /// widened when it is handed out.
+    /// Bytes, as wide text takes four times the memory: a line or block is widened when it is
+    /// handed out. Those that have been handed out as a block are used up.
     dcm::FileText m_content;
     std::int32_t m_nReadPos;
 };
