@@ -18,6 +18,9 @@ namespace dcm {
 /// can convert. Returns false, and changes nothing, when the identifier is unknown.
 DCM_API bool SetThreadCodePage(unsigned identifier);
 
+// The library's own, not exported.
+/// @cond
+
 /// Encodings in which a text can be cut at a line feed or a zero byte before it is widened: these
 /// bytes stand for themselves and are part of no other character.
 enum class Encoding : unsigned char
@@ -56,6 +59,8 @@ FileText FileTextFromWide(std::wstring_view text);
 /// The bytes for the file: those of `text`, or what UTF-8 becomes in a code page that cannot be
 /// cut.
 FileText ToThreadCodePage(FileText text);
+
+/// @endcond
 
 /// `text` in UTF-8, and the wide form of a text in UTF-8; what is no character becomes U+FFFD.
 DCM_API std::string ToUtf8(std::wstring_view text);
