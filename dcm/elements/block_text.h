@@ -73,8 +73,4 @@ private:
 /// Items on a line of points or values, but for the rows of a two-dimensional value block.
 inline constexpr int kItemsPerLine = 5;
 
-/// Significant digits that bring every number back, and those of a two-dimensional value block.
-inline constexpr int kFullDigits = 17;
-inline constexpr int kShortDigits = 15;
-
 } // namespace dcm

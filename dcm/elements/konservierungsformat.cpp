@@ -20,7 +20,7 @@ HRESULT DCMKonservierungsFormat::Init(const CString& strBlock)
     if (blank == text.npos)
         return S_OK;
     if (dcm::EqualsNoCase(text.substr(0, blank), dcm::keyword::kKonservierungFormat))
-        m_dValue = dcm::ReadNumber(dcm::TrimBlanksAndQuotes(text.substr(blank + 1)));
+        m_dValue = dcm::ReadDecimal(dcm::TrimBlanksAndQuotes(text.substr(blank + 1)));
     return S_OK;
 }
 

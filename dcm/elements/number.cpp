@@ -1,33 +1,29 @@
 #include "dcm/elements/number.h"
 
+#include "dcm/elements/decimal.h"
+#include "dcm/platform/text.h"
+
 #include <algorithm>
 #include <array>
 #include <bit>
 #include <charconv>
-#include <cmath>
+#include <cstdint>
+#include <cstdlib>
 #include <limits>
+#include <string_view>
 #include <system_error>
 
 namespace dcm {
 namespace {
 
+using namespace std::string_view_literals;
+
+/// The lowest decimal exponent in fixed notation.
+constexpr int kFixedMin = -4;
+
 constexpr bool IsDigit(wchar_t c)
 {
     return c >= L'0' && c <= L'9';
-}
-
-constexpr bool IsWhiteSpace(wchar_t c)
-{
-    return c == L' ' || (c >= L'\t' && c <= L'\r');
-}
-
-void SkipWhiteSpace(std::wstring_view& text)
-{
-    std::size_t n = 0;
-    while (n < text.size() && IsWhiteSpace(text[n])) {
-        ++n;
-    }
-    text.remove_prefix(n);
 }
 
 /// Takes a sign off the front of `text`; returns whether it was a minus sign.
@@ -40,29 +36,41 @@ bool TakeSign(std::wstring_view& text)
     return negative;
 }
 
-/// Whether `text` is "1.#Inf" in letters of either case.
-bool IsInfinityName(std::wstring_view text)
-{
-    constexpr std::wstring_view lower = L"1.#inf";
-    return std::equal(text.begin(), text.end(), lower.begin(), lower.end(), [](auto c, auto want) {
-        return c == want || (c >= L'A' && c <= L'Z' && c - L'A' + L'a' == want);
-    });
-}
+constexpr std::wstring_view kInfinityName = L"1.#INF";
 
-/// The name of an infinity or a not-a-number, without its sign.
-std::wstring_view SpecialName(double value)
+/// The name of the infinity or not-a-number with these bits, without its sign.
+std::wstring_view SpecialName(std::uint64_t bits)
 {
-    constexpr std::uint64_t fractionMask = 0x000F'FFFF'FFFF'FFFF;
     constexpr std::uint64_t quietBit = 0x0008'0000'0000'0000;
-    constexpr std::uint64_t defaultNotANumber = 0xFFF8'0000'0000'0000;
-    const auto bits = std::bit_cast<std::uint64_t>(value);
-    if ((bits & fractionMask) == 0) {
-        return L"1.#INF";
+    constexpr std::uint64_t defaultNotANumber = kSignBit | kInfinityBits | quietBit;
+    if ((bits & ~kSignBit) == kInfinityBits) {
+        return kInfinityName;
     }
     if (bits == defaultNotANumber) {
         return L"1.#IND";
     }
     return (bits & quietBit) != 0 ? L"1.#QNAN" : L"1.#SNAN";
+}
+
+/// Writes the digits 0 to 9 in the bytes of `digits`, the lowest byte first.
+void WriteEight(std::uint64_t digits, wchar_t* to)
+{
+    const auto bytes = std::bit_cast<std::array<unsigned char, 8>>(digits | 0x3030'3030'3030'3030);
+    for (std::size_t i = 0; i < bytes.size(); ++i) {
+        to[i] = bytes[i];
+    }
+}
+
+/// Writes "e", a sign and at least three digits.
+wchar_t* WriteExponent(int exponent, wchar_t* to)
+{
+    to[0] = L'e';
+    to[1] = exponent < 0 ? L'-' : L'+';
+    const int size = std::abs(exponent);
+    to[2] = static_cast<wchar_t>(L'0' + size / 100);
+    to[3] = static_cast<wchar_t>(L'0' + size / 10 % 10);
+    to[4] = static_cast<wchar_t>(L'0' + size % 10);
+    return to + 5;
 }
 
 /// A number's significant digits, without leading zeros, and the power of ten of the last one.
@@ -138,49 +146,190 @@ std::int64_t Exponent(std::wstring_view text)
     return negative ? -exponent : exponent;
 }
 
+/// ReadNumber for tokens of every kind and length.
+double ReadToken(std::wstring_view token) noexcept
+{
+    constexpr double infinity = std::numeric_limits<double>::infinity();
+    if (EqualsNoCase(token, kInfinityName)) {
+        return infinity;
+    }
+    if (token.starts_with(L'-') && EqualsNoCase(token.substr(1), kInfinityName)) {
+        return -infinity;
+    }
+    return ReadDecimal(token);
+}
+
+/// TakeNumber for tokens of every kind.
+[[gnu::noinline]] bool TakeAnyNumber(std::wstring_view& rest, double& value)
+{
+    const auto blank = rest.find(L' ');
+    value = ReadToken(rest.substr(0, blank));
+    rest.remove_prefix(std::min(blank, rest.size()));
+    rest = TrimLeft(rest, IsWhite);
+    return blank != rest.npos;
+}
+
+/// Appends the digits at `at` to `number`, one by one; returns their end.
+inline const wchar_t* TakeDigits(const wchar_t* at, const wchar_t* end, std::uint64_t& number)
+{
+    for (; at != end && IsDigit(*at); ++at) {
+        number = number * 10 + static_cast<std::uint64_t>(*at - L'0');
+    }
+    return at;
+}
+
+/// Takes the digits at `at` and a point among them; returns their end, or a null pointer when there
+/// is no digit. More than 19 digits overflow.
+inline const wchar_t* TakeFixed(const wchar_t* at, const wchar_t* end, Decimal& decimal)
+{
+    const auto bytes = end - at >= 8 ? DigitBytes(at) : 0;
+    const auto others = NotDigits(bytes);
+    if (others == 0) {
+        const auto* const start = at;
+        at = TakeDigits(at, end, decimal.digits);
+        const bool found = at != start;
+        if (at == end || *at != L'.') {
+            return found ? at : nullptr;
+        }
+        const auto* const fraction = at + 1;
+        at = TakeDigits(fraction, end, decimal.digits);
+        decimal.exponent = static_cast<int>(fraction - at);
+        return found || at != fraction ? at : nullptr;
+    }
+    // The digits in front of the first other character, those behind it if that is the point, and
+    // where they end or, after seven, the word does. All positions are in bits.
+    const int first = std::countr_zero(others) & 56;
+    const int point = ((bytes >> first) & 0xFF) == ('.' ^ '0') ? 8 : 0;
+    const auto front = (std::uint64_t{1} << first) - 1;
+    const auto digits = (bytes & front) | ((bytes >> point) & ~front);
+    const auto behind = ((others >> point) & ~front) | kSignBit;
+    const int size = std::countr_zero(behind) & 56;
+    if (size == 0) {
+        return nullptr;
+    }
+    decimal.digits = JoinEight(digits << (64 - size));
+    decimal.exponent = (first - size) >> 3;
+    at += (size + point) >> 3;
+    if (size < 56) {
+        return at;
+    }
+    const auto* const more = at;
+    if (end - at >= 8) {
+        const auto next = DigitBytes(at);
+        if (NotDigits(next) == 0) {
+            decimal.digits = decimal.digits * kTenTo8 + JoinEight(next);
+            at += 8;
+        }
+    }
+    at = TakeDigits(at, end, decimal.digits);
+    decimal.exponent -= static_cast<int>(at - more);
+    return at;
+}
+
+/// Adds the exponent at `at`, "e" included, to `exponent` and returns its end; `at` itself when
+/// there is none of one to four digits.
+const wchar_t* TakeExponent(const wchar_t* at, const wchar_t* end, int& exponent)
+{
+    const auto* next = at;
+    if (*next != L'e' && *next != L'E') {
+        return at;
+    }
+    ++next;
+    const bool negative = next != end && *next == L'-';
+    next += negative || (next != end && *next == L'+') ? 1 : 0;
+    std::uint64_t size = 0;
+    const auto* const last = TakeDigits(next, std::min(next + 4, end), size);
+    if (last == next) {
+        return at;
+    }
+    exponent += negative ? -static_cast<int>(size) : static_cast<int>(size);
+    return last;
+}
+
+/// Reads the decimal number at `at` in the forms that files are full of, and returns its end; a
+/// null pointer for all that ReadToken must see.
+inline const wchar_t* TakeDecimal(const wchar_t* at, const wchar_t* end, double& value)
+{
+    const std::uint64_t negative = at != end && *at == L'-' ? 1 : 0;
+    at += negative;
+    const auto* start = at;
+    Decimal decimal;
+    at = TakeFixed(at, end, decimal);
+    if (at == nullptr) {
+        return nullptr;
+    }
+    constexpr std::ptrdiff_t most = 19;
+    if (at - start > most) {
+        while (start != at && (*start == L'0' || *start == L'.')) {
+            ++start;
+        }
+        if (at - start > most) {
+            return nullptr;
+        }
+    }
+    if (at != end && *at != L' ') {
+        at = TakeExponent(at, end, decimal.exponent);
+    }
+    if (!ToDouble(decimal, value)) {
+        return nullptr;
+    }
+    value = std::bit_cast<double>(std::bit_cast<std::uint64_t>(value) | negative << 63);
+    return at;
+}
+
 } // namespace
 
 wchar_t* WriteNumber(double value, int digits, wchar_t* to) noexcept
 {
+    const auto bits = std::bit_cast<std::uint64_t>(value);
     *to++ = L' ';
-    if (!std::isfinite(value)) {
-        if (std::signbit(value)) {
-            *to++ = L'-';
+    *to = L'-';
+    to += bits >> 63;
+    const auto magnitude = bits & ~kSignBit;
+    if (magnitude - 1 >= kInfinityBits - 1) {
+        return std::ranges::copy(magnitude == 0 ? L"0.0"sv : SpecialName(bits), to).out;
+    }
+    const auto decimal = ToDecimal(std::bit_cast<double>(magnitude), digits);
+    const int exponent = decimal.exponent + digits - 1;
+    // The first of seventeen digits, and two words of eight.
+    const auto whole = digits == 17 ? decimal.digits : decimal.digits * 100;
+    const auto first = static_cast<wchar_t>(L'0' + whole / kTenTo16);
+    const auto upper = SplitEight(whole % kTenTo16 / kTenTo8);
+    const auto lower = SplitEight(whole % kTenTo8);
+    const int count =
+        lower != 0 ? 17 - std::countl_zero(lower) / 8 : 9 - std::countl_zero(upper) / 8;
+
+    if (exponent >= 0 && exponent < digits) {
+        // All digits, then over them those of the fraction again, behind the point.
+        to[0] = first;
+        WriteEight(upper, to + 1);
+        WriteEight(lower, to + 9);
+        to[exponent + 1] = L'.';
+        const auto fraction = ((uint128{lower} << 64) | upper) >> std::min(8 * exponent, 127);
+        WriteEight(static_cast<std::uint64_t>(fraction), to + exponent + 2);
+        if (exponent < 8) {
+            WriteEight(static_cast<std::uint64_t>(fraction >> 64), to + exponent + 10);
         }
-        return std::ranges::copy(SpecialName(value), to).out;
+        return to + std::max(count, exponent + 2) + 1;
     }
-    std::array<char, kNumberTextMax> text;
-    const auto begin = text.begin();
-    const auto end = std::next(begin, std::to_chars(text.data(), text.data() + text.size(), value,
-                                                    std::chars_format::general, digits)
-                                              .ptr -
-                                          text.data());
-    const auto letter = std::find(begin, end, 'e');
-    to = std::copy(begin, letter, to);
-    if (letter != end) {
-        to = std::copy(letter, letter + 2, to);
-        if (end - letter == 4) {
-            *to++ = L'0';
-        }
-        return std::copy(letter + 2, end, to);
+    if (exponent >= kFixedMin && exponent < 0) {
+        std::ranges::copy(L"0.000"sv, to);
+        to += 1 - exponent;
+        to[0] = first;
+        WriteEight(upper, to + 1);
+        WriteEight(lower, to + 9);
+        return to + count;
     }
-    if (std::find(begin, end, '.') == end) {
-        *to++ = L'.';
-        *to++ = L'0';
-    }
-    return to;
+    to[0] = first;
+    to[1] = L'.';
+    WriteEight(upper, to + 2);
+    WriteEight(lower, to + 10);
+    return WriteExponent(exponent, to + (count > 1 ? count + 1 : 1));
 }
 
-double ReadNumber(std::wstring_view token) noexcept
+double ReadDecimal(std::wstring_view text) noexcept
 {
-    constexpr double infinity = std::numeric_limits<double>::infinity();
-    if (IsInfinityName(token)) {
-        return infinity;
-    }
-    if (token.starts_with(L'-') && IsInfinityName(token.substr(1))) {
-        return -infinity;
-    }
-    SkipWhiteSpace(token);
+    std::wstring_view token = TrimLeft(text, IsWhite);
     const bool negative = TakeSign(token);
     ExactDecimal decimal;
     bool point = false;
@@ -202,22 +351,34 @@ double ReadNumber(std::wstring_view token) noexcept
     return negative ? -value : value;
 }
 
+double ReadNumber(std::wstring_view token) noexcept
+{
+    auto rest = token;
+    double value = 0.0;
+    return TakeNumber(rest, value) ? ReadToken(token) : value;
+}
+
 bool TakeNumber(std::wstring_view& rest, double& value) noexcept
 {
-    const auto blank = rest.find(L' ');
-    value = ReadNumber(rest.substr(0, blank));
-    if (blank == rest.npos) {
-        rest = {};
-        return false;
+    const auto* const end = rest.data() + rest.size();
+    const auto* at = TakeDecimal(rest.data(), end, value);
+    if (at == nullptr || (at != end && *at != L' ')) {
+        return TakeAnyNumber(rest, value);
     }
-    rest.remove_prefix(blank);
-    SkipWhiteSpace(rest);
-    return true;
+    const bool more = at != end;
+    while (at != end && *at == L' ') {
+        ++at;
+    }
+    rest = {at, static_cast<std::size_t>(end - at)};
+    if (at != end && *at < L' ') {
+        rest = TrimLeft(rest, IsWhite);
+    }
+    return more;
 }
 
 std::int32_t ReadInteger(std::wstring_view text) noexcept
 {
-    SkipWhiteSpace(text);
+    text = TrimLeft(text, IsWhite);
     const bool negative = TakeSign(text);
     constexpr std::int64_t limit = std::int64_t{1} << 31;
     std::int64_t value = 0;

@@ -9,6 +9,10 @@ namespace dcm {
 /// Room that WriteNumber needs, in characters.
 inline constexpr std::size_t kNumberTextMax = 32;
 
+/// Significant digits that bring every number back, and those of a two-dimensional value block.
+inline constexpr int kFullDigits = 17;
+inline constexpr int kShortDigits = 15;
+
 /// Writes `value` with `digits` (17 or 15) significant digits at `to`: a blank, then the shortest
 /// of these digits in fixed notation, or in exponent notation (at least three digits of exponent)
 /// below 1e-4 and from 10 to the power of `digits`; ".0" follows an integer. Infinities and
@@ -16,9 +20,13 @@ inline constexpr std::size_t kNumberTextMax = 32;
 /// terminator. Characters behind the end, up to kNumberTextMax, may be overwritten.
 wchar_t* WriteNumber(double value, int digits, wchar_t* to) noexcept;
 
+/// The number at the start of `text`, behind white space: its longest prefix that is a decimal
+/// number, rounded to nearest, ties to even; too large a number is infinity. Without a number +0.0,
+/// also behind a sign.
+double ReadDecimal(std::wstring_view text) noexcept;
+
 /// The value of a whole token: infinity for "1.#Inf" and "-1.#Inf" in letters of either case, else
-/// the longest prefix behind white space that is a decimal number, rounded to nearest, ties to
-/// even; too large a number is infinity. A token without a number is +0.0, also behind a sign.
+/// what ReadDecimal reads.
 double ReadNumber(std::wstring_view token) noexcept;
 
 /// Reads the token in front of the first blank of `rest` (all of it without a blank) as ReadNumber

@@ -1,0 +1,161 @@
+#pragma once
+
+#include <array>
+#include <bit>
+#include <cstddef>
+#include <cstdint>
+
+// The fast conversions between doubles, decimal digits and characters.
+//
+// How one product converts both ways: each power of ten is 10^q = (T + d) x 2^(Exponent2(q) - 127),
+// where T is the 128-bit integer of the table, its highest bit set, and 0 <= d < 1 is what the
+// table leaves out. Let w be a 64-bit integer. With H, the upper 128 bits of the product w x T of
+// 192 bits,
+//
+//     H x 2^64  <=  w x (T + d)  <  w x T + 2^64  <  (H + 2) x 2^64,
+//
+// so the exact product lies in [H, H + 2) in units of 2^64. To round it at a higher bit is to ask
+// on which side of a point B half-way between two results it lies: above when H > B, below when
+// H + 2 <= B. Only H = B and H = B - 1 leave it open, and those few numbers go another, exact way.
+// (Where the interval reaches past a result, as it does just short of an exact one, both its ends
+// round to that result.) The same holds with 64 in place of 128 bits of T and H.
+namespace dcm {
+
+/// Like std::uint64_t, twice as wide.
+__extension__ typedef unsigned __int128 uint128;
+
+constexpr std::uint64_t kTenTo8 = 100'000'000;
+constexpr std::uint64_t kTenTo16 = kTenTo8 * kTenTo8;
+
+/// The layout of a double: sign, 11 bits of exponent, 52 of fraction.
+constexpr std::uint64_t kSignBit = 0x8000'0000'0000'0000;
+constexpr std::uint64_t kInfinityBits = 0x7FF0'0000'0000'0000;
+constexpr int kFractionBits = 52;
+constexpr int kExponentBias = 1023;
+
+/// The number digits x 10^exponent.
+struct Decimal
+{
+    std::uint64_t digits = 0;
+    int exponent = 0;
+};
+
+/// A power of ten's upper 128 bits: T above.
+struct Power
+{
+    std::uint64_t high;
+    std::uint64_t low;
+};
+
+constexpr int kMinPower = -342;
+constexpr int kMaxPower = 341;
+extern const std::array<Power, kMaxPower - kMinPower + 1> kPowers;
+
+/// The index of a power of ten in kPowers.
+constexpr std::size_t PowerIndex(int power)
+{
+    return static_cast<std::size_t>(power - kMinPower);
+}
+
+/// floor(log2(10^power)).
+constexpr int Exponent2(int power)
+{
+    return (power * 217'706) >> 16;
+}
+
+/// `value`, finite and above zero, correctly rounded to `count` (15 or 17) significant digits, ties
+/// to even: `digits` has just that many.
+Decimal ToDecimal(double value, int count) noexcept;
+
+/// Stores the double nearest to `decimal` and returns true; false when this way cannot tell, as for
+/// one number of many digits in five hundred, or when the result is not a normal number.
+inline bool ToDouble(Decimal decimal, double& value) noexcept
+{
+    if (decimal.digits == 0) {
+        value = 0.0;
+        return true;
+    }
+    if (decimal.exponent < kMinPower || decimal.exponent > kMaxPower) {
+        return false;
+    }
+    const int zeros = std::countl_zero(decimal.digits);
+    const auto product =
+        uint128{decimal.digits << zeros} * kPowers[PowerIndex(decimal.exponent)].high;
+    const auto h = static_cast<std::uint64_t>(product >> 64);
+    // H becomes a significand of 53 bits and 10 more. Where it loses a bit by that, the exact
+    // product still lies in [H, H + 2).
+    constexpr int places = 10;
+    constexpr auto half = std::uint64_t{1} << (places - 1);
+    const int above = static_cast<int>(h >> 63);
+    const auto significand = h >> above;
+    const int biased =
+        Exponent2(decimal.exponent) + 1 + above - zeros + places + kFractionBits + kExponentBias;
+    if ((significand + 1 - half) % (2 * half) <= 1 || biased < 1 || biased >= 2 * kExponentBias) {
+        return false;
+    }
+    // The significand's highest bit adds 1 to the exponent, and rounding up may carry into it.
+    value = std::bit_cast<double>((static_cast<std::uint64_t>(biased - 1) << kFractionBits) +
+                                  ((significand + half) >> places));
+    return true;
+}
+
+/// Eight times the byte `value`.
+constexpr std::uint64_t EightTimes(unsigned char value)
+{
+    return value * std::uint64_t{0x0101'0101'0101'0101};
+}
+
+/// Four characters in the bytes of a word, the first in the lowest. Adds the bits of all of them
+/// to `all`: beyond U+007F they do not fit their bytes.
+inline std::uint64_t PackFour(const wchar_t* at, std::uint64_t& all)
+{
+    const auto pair = [](const wchar_t* two) {
+        return static_cast<std::uint32_t>(two[0]) |
+               std::uint64_t{static_cast<std::uint32_t>(two[1])} << 32;
+    };
+    const auto first = pair(at);
+    const auto second = pair(at + 2);
+    all |= first | second;
+    const auto mixed = first | second << 16; // 0 and 2 in the lower half, 1 and 3 in the upper
+    return (mixed | mixed >> 24) & 0xFFFF'FFFF;
+}
+
+/// The eight characters at `at` as bytes, 0 to 9 for digits and others below 0x80 for the rest, the
+/// first in the lowest byte; no digits at all if a character is beyond U+007F.
+inline std::uint64_t DigitBytes(const wchar_t* at)
+{
+    std::uint64_t all = 0;
+    const auto text = PackFour(at, all) | PackFour(at + 4, all) << 32;
+    const bool ascii = (all & 0xFFFF'FF80'FFFF'FF80) == 0;
+    return ascii ? text ^ EightTimes('0') : EightTimes(0x7F);
+}
+
+/// Bits in the upper half of each byte that is not a digit, none in those that are: only 10 to 15
+/// need the added 6 to reach the upper half.
+constexpr std::uint64_t NotDigits(std::uint64_t bytes)
+{
+    return (bytes | (bytes + EightTimes(6))) & EightTimes(0xF0);
+}
+
+/// The number whose digits are the bytes 0 to 9 of a word, the first in the lowest byte.
+constexpr std::uint64_t JoinEight(std::uint64_t bytes)
+{
+    // Two digits, four, eight: each step joins neighbours by one product.
+    bytes = (bytes * (1 + (10 << 8))) >> 8 & 0x00FF'00FF'00FF'00FF;
+    bytes = (bytes * (1 + (100 << 16))) >> 16 & 0x0000'FFFF'0000'FFFF;
+    return (bytes * (1 + (std::uint64_t{10'000} << 32))) >> 32;
+}
+
+/// The reverse of JoinEight: the eight digits of a number below 10^8.
+constexpr std::uint64_t SplitEight(std::uint64_t number)
+{
+    // Each step divides all parts at once, by a product with the rounded-up reciprocal that is
+    // exact for parts this small; quotient and remainder share the part's room.
+    const auto halves = number / 10'000 + ((number % 10'000) << 32);
+    const auto hundreds = ((halves * 10'486) >> 20) & 0x0000'007F'0000'007F;
+    const auto quarters = hundreds + ((halves - hundreds * 100) << 16);
+    const auto tens = ((quarters * 103) >> 10) & 0x000F'000F'000F'000F;
+    return tens + ((quarters - tens * 10) << 8);
+}
+
+} // namespace dcm
