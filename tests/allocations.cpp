@@ -8,6 +8,8 @@
 namespace {
 
 constinit std::atomic<long> live = 0;
+constinit thread_local long untilFailure = 0;
+constinit thread_local bool failed = false;
 
 } // namespace
 
@@ -16,8 +18,23 @@ long test::LiveAllocations() noexcept
     return live;
 }
 
+void test::FailAllocation(long number) noexcept
+{
+    untilFailure = number;
+    failed = false;
+}
+
+bool test::AllocationHasFailed() noexcept
+{
+    return failed;
+}
+
 void* operator new(std::size_t size, const std::nothrow_t&) noexcept
 {
+    if (untilFailure > 0 && --untilFailure == 0) {
+        failed = true;
+        return nullptr;
+    }
     void* const memory = std::malloc(size == 0 ? 1 : size);
     live += memory != nullptr ? 1 : 0;
     return memory;
