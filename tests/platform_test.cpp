@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <iterator>
 #include <limits>
 #include <new>
 #include <thread>
@@ -45,9 +46,8 @@ TEST(Text, SharesItsCharactersUntilOneCopyChanges)
     EXPECT_EQ(a, L"abc");
     a = b;
     b.Empty();
-    EXPECT_EQ(a + b, L"abcd");
     const CString moved(std::move(a));
-    EXPECT_EQ(moved + a, L"abcd");
+    EXPECT_EQ(moved + a + b, L"abcd");
     // Even the keywords' own memory, which no string may write to.
     CString keyword(dcm::keyword::kWert);
     const CString other(dcm::keyword::kWert);
@@ -74,21 +74,12 @@ TEST(Text, AppendsItselfAndPartsOfItself)
 
 TEST(Text, ComparesAndRefusesWhatIsOutside)
 {
-    const std::tuple<CString, CString, int, int> cases[] = {{L"a", L"", 1, 1},
-                                                            {L"aZ", L"Az", 1, 0},
-                                                            {L"ab", L"B", 1, -1},
-                                                            {L"\u00C4", L"\u00E4", -1, -1},
-
-                                                            {L"\u017F", L"s", 1, 1}};
-    const auto sign = [](int n) { return (n > 0) - (n < 0); };
-    for (const auto& [a, b, withCase, without] : cases) {
-        EXPECT_EQ(sign(a.Compare(b)), withCase);
-        EXPECT_EQ(sign(a.CompareNoCase(b)), without);
-        EXPECT_EQ(a < b, withCase < 0);
-        EXPECT_EQ(a == b, withCase == 0);
-    }
+    EXPECT_GT(CString(L"aZ").Compare(L"Az"), 0);
+    EXPECT_EQ(CString(L"aZ[").CompareNoCase(L"Az["), 0);
+    EXPECT_LT(CString(L"ab").CompareNoCase(L"B"), 0);
+    EXPECT_LT(CString(L"\u00C4").CompareNoCase(L"\u00E4"), 0) << "only A to Z have two cases";
+    EXPECT_GT(CString(L"\u017F").CompareNoCase(L"s"), 0);
     CString text(L"ab");
-    EXPECT_EQ(text.GetAt(1), L'b');
     EXPECT_THROW(text.GetAt(-1), dcm::ResultError);
     EXPECT_THROW(text.GetAt(2), dcm::ResultError);
     EXPECT_THROW(text.Extend(std::numeric_limits<std::size_t>::max()), std::bad_alloc);
@@ -98,53 +89,34 @@ TEST(Text, ComparesAndRefusesWhatIsOutside)
     EXPECT_EQ(CString(noText) + L"x" + CString("\xB5") + CString(noBytes), L"x\u00B5");
 }
 
-TEST(Variant, TakesTheTagOfWhatItIsMadeFrom)
+TEST(Variant, OwnsWhatItHolds)
 {
-    const wchar_t* const noText = nullptr;
-    const std::pair<CComVariant, VARTYPE> cases[] = {{CComVariant(), VT_EMPTY},
-                                                     {1.5, VT_R8},
-
-                                                     {7, VT_I4},
-
-                                                     {7U, VT_UI4},
-                                                     {7LL, VT_I8},
-                                                     {true, VT_BOOL},
-                                                     {L"a", VT_BSTR},
-
-                                                     {noText, VT_BSTR}};
-    for (const auto& [value, tag] : cases) {
-        EXPECT_EQ(value.vt, tag);
+    const wchar_t* const absent = nullptr;
+    const CComVariant values[] = {CComVariant(), 1.5, 1.5F, 7, 7U, 7LL, true, L"a", absent};
+    const VARTYPE tags[] = {VT_EMPTY, VT_R8,   VT_R4,   VT_I4,  VT_UI4,
+                            VT_I8,    VT_BOOL, VT_BSTR, VT_BSTR};
+    for (std::size_t i = 0; i < std::size(values); ++i) {
+        EXPECT_EQ(values[i].vt, tags[i]);
         CComVariant copy(L"old");
-        copy = static_cast<const VARIANT&>(value);
-        EXPECT_EQ(Show(copy), Show(value));
-        if (tag != VT_BSTR) {
-            EXPECT_EQ(copy.llVal, value.llVal);
-        } else if (value.bstrVal != nullptr) {
-            EXPECT_NE(copy.bstrVal, value.bstrVal);
-        }
+        copy = static_cast<const VARIANT&>(values[i]);
+        copy = *&copy;
+        EXPECT_EQ(Show(copy), Show(values[i]));
+        // A text is the copy's own, anything else is the same.
+        EXPECT_EQ(copy.llVal == values[i].llVal, Show(copy) != "'a'");
         const CComVariant moved(std::move(copy));
-        EXPECT_EQ(Show(moved), Show(value));
+        EXPECT_EQ(Show(moved), Show(values[i]));
         EXPECT_EQ(copy.vt, VT_EMPTY);
     }
-    EXPECT_EQ(CComVariant(true).boolVal, VARIANT_TRUE);
-}
-
-TEST(Variant, CopiesATextWithItsZeros)
-{
+    EXPECT_EQ(values[6].boolVal, VARIANT_TRUE);
     VARIANT text{};
     text.vt = VT_BSTR;
     text.bstrVal = SysAllocStringLen(L"a\0b", 3);
     CComVariant copy(text);
     EXPECT_EQ(VariantCopy(&text, &text), S_OK);
     EXPECT_EQ(VariantClear(&text), S_OK);
-    EXPECT_EQ(text.vt, VT_EMPTY);
-    copy = *&copy;
-    VARIANT detached = copy.Detach();
-    EXPECT_EQ(copy.vt, VT_EMPTY);
-    EXPECT_EQ(std::wstring(detached.bstrVal, SysStringLen(detached.bstrVal)),
-              std::wstring(L"a\0b", 3));
-    EXPECT_EQ(VariantClear(&detached), S_OK);
-    EXPECT_EQ(SysStringLen(SysAllocString(nullptr)), 0U);
+    text = copy.Detach();
+    EXPECT_EQ(SysStringLen(text.bstrVal), 3U) << "a zero does not end it";
+    EXPECT_EQ(VariantClear(&text), S_OK);
 }
 
 TEST(Variant, RefusesTagsThatItDoesNotKnow)
@@ -169,9 +141,8 @@ TEST(CodePages, ConvertCharactersBothWays)
         {1252, "20\xB0 \xE4 \xB5 \x80", L"20\u00B0 \u00E4 \u00B5 \u20AC"},
         {1252, "\x81\x8D\x8F\x90\x9D", L"\u0081\u008D\u008F\u0090\u009D"},
         {28591, "\xB0\x80\xFF", L"\u00B0\u0080\u00FF"},
-        {65001, "\xC2\xB0 \xE2\x82\xAC \xF0\x9F\x98\x80 \xEF\xBB\xBF",
-         L"\u00B0 \u20AC \U0001F600 \uFEFF"},
-        {65001, "sixteen ASCII characters and \xC3\xA4", L"sixteen ASCII characters and \u00E4"},
+        {65001, "sixteen ASCII characters and \xC2\xB0 \xE2\x82\xAC \xF0\x9F\x98\x80 \xEF\xBB\xBF",
+         L"sixteen ASCII characters and \u00B0 \u20AC \U0001F600 \uFEFF"},
         {932, "\x93\xFA\x96{ \xB1", L"\u65E5\u672C \uFF71"},
         {500, "\xC1\x82\x25", L"Ab\n"}};
     for (const auto& [identifier, bytes, text] : cases) {
@@ -195,8 +166,6 @@ TEST(CodePages, PutAMarkForWhatIsNoCharacter)
     const std::wstring half(1, static_cast<wchar_t>(0xD800));
     const std::tuple<unsigned, std::wstring, std::string_view> lacking[] = {
         {1252, L"a\u03A9\u65E5\u0080z", "a???z"},
-
-        {1252, L"\U0001F600", sizeof(wchar_t) == 2 ? "??" : "?"},
         {932, L"a\u00E4z", "a?z"},
         {500, L"A\u65E5", "\xC1\x6F"},
         {65001, L"a" + half, "a\xEF\xBF\xBD"}};
@@ -204,28 +173,18 @@ TEST(CodePages, PutAMarkForWhatIsNoCharacter)
         const CodePage page(identifier);
         EXPECT_EQ(Narrow(text), bytes) << identifier;
     }
-    const std::pair<std::string_view, std::wstring_view> invalid[] = {
-        {"a\xFFz", L"a\uFFFDz"},
-        {"\xC0\x80", L"\uFFFD\uFFFD"},
-
-        {"\xE2\x82!", L"\uFFFD!"},
-        {"\xE2\x82", L"\uFFFD"},
-        {"\xED\xA0\x80", L"\uFFFD\uFFFD\uFFFD"},
-
-        {"\xF4\x90\x80\x80", L"\uFFFD\uFFFD\uFFFD\uFFFD"}};
+    // A mark for each byte that cannot go on, one for a character cut short.
     const CodePage utf8(65001);
-    for (const auto& [bytes, text] : invalid)
-        EXPECT_EQ(dcm::Widen(bytes), text) << testing::PrintToString(bytes);
+    EXPECT_EQ(dcm::Widen("a\xFFz \xC0\x80 \xE2\x82! \xED\xA0\x80 \xE0\x9F \xF4\x90\x80 \xE2\x82"),
+              L"a\uFFFDz \uFFFD\uFFFD \uFFFD! \uFFFD\uFFFD\uFFFD \uFFFD\uFFFD "
+              L"\uFFFD\uFFFD\uFFFD \uFFFD");
 }
 
 TEST(CodePages, BelongToTheThreadThatChoseThem)
 {
     const CodePage utf8(65001);
     EXPECT_FALSE(dcm::SetThreadCodePage(4711));
-    EXPECT_EQ(Narrow(L"\u00B5"), "\xC2\xB5");
-    std::string other;
-    std::thread([&] { dcm::SetThreadCodePage(1252), other = Narrow(L"\u00B5"); }).join();
-    EXPECT_EQ(other, "\xB5");
+    std::thread([] { dcm::SetThreadCodePage(1252); }).join();
     EXPECT_EQ(Narrow(L"\u00B5"), "\xC2\xB5");
 }
 
@@ -242,10 +201,6 @@ TEST(File, KeepsOthersOutWhileItIsOpen)
             CFileException error;
             EXPECT_FALSE(other.Open(path, second, &error));
             EXPECT_EQ(error.m_cause, CFileException::sharingViolation);
-            EXPECT_EQ(error.m_strFileName, path);
-            EXPECT_THROW(CFile(path, second), CFileException);
-            CFileStatus status;
-            EXPECT_FALSE(other.GetStatus(status));
             // What was refused neither emptied the file nor took it from its holder.
             EXPECT_EQ(holder.GetLength(), 4U);
             holder.Close();
@@ -272,7 +227,6 @@ TEST(File, SaysWhyItCannotBeOpened)
         EXPECT_FALSE(CFile().Open(path, flags));
         EXPECT_THROW(CFile(path, flags), CFileException);
     }
-    EXPECT_THROW(CFile(folder / L"no/such/folder", kCreate), CFileException);
     EXPECT_THROW(CFile(L"", kRead), CFileException);
 }
 
@@ -289,14 +243,14 @@ TEST(File, ReadsAndWritesWhatItsFlagsSay)
     EXPECT_EQ(file.Read(bytes, 3) + file.Read(bytes + 3, 5), 6U);
     EXPECT_STREQ(bytes, "XYcdef");
     file.Write("g", 1);
-    CFileStatus status;
-    EXPECT_TRUE(file.GetStatus(status));
-    EXPECT_EQ(status.m_size, 7U);
+    EXPECT_EQ(file.GetLength(), 7U);
     EXPECT_TRUE(file.Open(path, kCreate));
     EXPECT_EQ(file.GetLength(), 0U);
     EXPECT_THROW(file.Read(bytes, 1), CFileException) << "a file that is only written";
     file.Close();
     file.Close();
+    CFileStatus status;
+    EXPECT_FALSE(file.GetStatus(status));
     EXPECT_THROW(file.GetLength(), CFileException);
     EXPECT_THROW(file.Read(bytes, 1), CFileException);
     EXPECT_THROW(file.Write(bytes, 1), CFileException);
@@ -306,10 +260,8 @@ TEST(Modules, StandInTheListWhileTheyAreLoaded)
 {
     CDynLinkLibrary* const before = CDynLinkLibrary::Last();
     AFX_EXTENSION_MODULE one, two;
-    int handle = 0;
-    EXPECT_TRUE(AfxInitExtensionModule(one, &handle));
+    EXPECT_TRUE(AfxInitExtensionModule(one, nullptr));
     EXPECT_FALSE(AfxInitExtensionModule(one, nullptr));
-    EXPECT_EQ(one.hModule, &handle);
     EXPECT_TRUE(AfxInitExtensionModule(two, nullptr));
     auto* const first = new CDynLinkLibrary(one);
     auto* const second = new CDynLinkLibrary(two);

@@ -107,6 +107,17 @@ inline std::string Show(const CString& text)
     return "'" + dcm::ToUtf8(text) + "'";
 }
 
+inline std::string Show(int number)
+{
+    return std::to_string(number);
+}
+
+/// What is shown already.
+inline std::string Show(const std::string& text)
+{
+    return text;
+}
+
 /// The shortest text of a number, whatever the locale.
 inline std::string Show(double value)
 {
