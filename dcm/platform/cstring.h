@@ -31,7 +31,7 @@ class TextConstant
 {
 public:
     /// Copies a literal, at compile time.
-    constexpr TextConstant(const wchar_t (&text)[N]) : m_data{-1, N - 1, N - 1}, m_text{}
+    constexpr TextConstant(const wchar_t (&text)[N]) : m_data{-1, N - 1, N - 1}
     {
         for (std::size_t i = 0; i < N; ++i)
             m_text[i] = text[i];
@@ -44,7 +44,7 @@ private:
     friend class ::CString;
 
     CStringData m_data;
-    wchar_t m_text[N];
+    wchar_t m_text[N] = {};
 };
 
 } // namespace dcm
