@@ -67,7 +67,8 @@ void CComVariant::OwnCopy()
     const VARIANT nothing = {};
     if (std::memcmp(&llVal, &nothing.llVal, sizeof(VARIANT) - head) == 0)
         return;
-    const VARIANT other = *this;
+    // Not constant: the system's own function takes its source as one that may be written.
+    VARIANT other = *this;
     VariantInit(this);
     const HRESULT result = VariantCopy(this, &other);
     if (FAILED(result))
