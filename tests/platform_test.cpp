@@ -15,11 +15,6 @@ using namespace test;
 
 namespace {
 
-std::string Narrow(std::wstring_view text)
-{
-    return std::string(dcm::ToThreadCodePage(dcm::FileTextFromWide(text)).View());
-}
-
 const wchar_t* Address(const CString& text)
 {
     return text;
@@ -153,8 +148,8 @@ TEST(CodePages, ConvertCharactersBothWays)
         EXPECT_EQ(Narrow(text), bytes);
     }
     std::string all;
-    for (int byte = 0; byte < 256; ++byte)
-        all += static_cast<char>(byte);
+    for (int number = 0; number < 256; ++number)
+        all += static_cast<char>(number);
     for (const unsigned identifier : {1252U, 28591U}) {
         const CodePage page(identifier);
         EXPECT_EQ(Narrow(dcm::Widen(all)), all);
@@ -166,6 +161,7 @@ TEST(CodePages, PutAMarkForWhatIsNoCharacter)
     const std::wstring half(1, static_cast<wchar_t>(0xD800));
     const std::tuple<unsigned, std::wstring, std::string_view> lacking[] = {
         {1252, L"a\u03A9\u65E5\u0080z", "a???z"},
+        {1252, L"\U0001F600", "?"},
         {932, L"a\u00E4z", "a?z"},
         {500, L"A\u65E5", "\xC1\x6F"},
         {65001, L"a" + half, "a\xEF\xBF\xBD"}};
@@ -228,6 +224,22 @@ TEST(File, SaysWhyItCannotBeOpened)
         EXPECT_THROW(CFile(path, flags), CFileException);
     }
     EXPECT_THROW(CFile(L"", kRead), CFileException);
+}
+
+TEST(File, IsRefusedFromTwoGibibytesOn)
+{
+    const Folder folder;
+    const CString path = folder / L"large";
+    WriteBytes(path, "");
+    std::filesystem::resize_file(PathOf(path), (1ULL << 31) - 1);
+    EXPECT_TRUE(CFile().Open(path, kRead));
+    std::filesystem::resize_file(PathOf(path), 1ULL << 31);
+    for (const UINT flags : {kRead, kCreate}) {
+        CFileException error;
+        EXPECT_FALSE(CFile().Open(path, flags, &error));
+        EXPECT_EQ(error.m_cause, CFileException::fileTooLarge);
+    }
+    EXPECT_EQ(std::filesystem::file_size(PathOf(path)), 1ULL << 31);
 }
 
 TEST(File, ReadsAndWritesWhatItsFlagsSay)

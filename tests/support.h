@@ -75,6 +75,12 @@ inline std::string Replaced(std::string text, std::string_view from, std::string
     return text;
 }
 
+/// `text` in the thread's code page.
+inline std::string Narrow(std::wstring_view text)
+{
+    return std::string(dcm::ToThreadCodePage(dcm::FileTextFromWide(text)).View());
+}
+
 /// What a block writes, with single line feeds. `block` is changed as its export changes it.
 template <class Block>
 std::string Written(Block&& block)

@@ -1,0 +1,82 @@
+#include "tests/support.h"
+
+#include <gtest/gtest.h>
+
+#include <thread>
+
+using namespace test;
+
+namespace {
+
+CFileException::Cause CauseOfOpening(const CString& path, UINT flags)
+{
+    CFileException error;
+    return CFile().Open(path, flags, &error) ? CFileException::none : error.m_cause;
+}
+
+} // namespace
+
+TEST(WindowsFile, RefusesPipes)
+{
+    const CString path(L"\\\\.\\pipe\\dcm_test");
+    for (const UINT flags : {kRead, kCreate}) {
+        const HANDLE pipe = CreateNamedPipeW(path, PIPE_ACCESS_DUPLEX, 0, 1, 16, 16, 0, nullptr);
+        ASSERT_NE(pipe, INVALID_HANDLE_VALUE);
+        EXPECT_EQ(CauseOfOpening(path, flags), CFileException::accessDenied);
+        CloseHandle(pipe);
+    }
+}
+
+TEST(WindowsFile, IsRefusedWhileAnotherProgramHasItOpen)
+{
+    const Folder folder;
+    const CString path = folder / L"held.dcm";
+    DCMConverter document;
+    ASSERT_EQ(document.Export(path), S_OK);
+    const std::string before = ReadBytes(path);
+    constexpr DWORD kShareWithAll = FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE;
+    const HANDLE other =
+        CreateFileW(path, GENERIC_READ, kShareWithAll, nullptr, OPEN_EXISTING, 0, nullptr);
+    ASSERT_NE(other, INVALID_HANDLE_VALUE);
+    document.SetHeader(L"new");
+    EXPECT_EQ(CauseOfOpening(path, kCreate), CFileException::sharingViolation);
+    EXPECT_EQ(document.Import(path), E_UNEXPECTED);
+    EXPECT_EQ(document.Export(path), E_UNEXPECTED);
+    EXPECT_EQ(ReadBytes(path), before);
+    CloseHandle(other);
+    EXPECT_EQ(document.Export(path), S_OK);
+}
+
+TEST(WindowsFile, TakesTheEmptyDevice)
+{
+    DCMConverter document;
+    EXPECT_EQ(document.Export(L"NUL"), S_OK);
+    EXPECT_EQ(document.Import(L"NUL"), S_OK);
+}
+
+TEST(WindowsCodePages, StartWithThatOfTheThread)
+{
+    std::string bytes;
+    // A new thread: this one may have chosen a page.
+    std::thread([&] {
+        SetThreadLocale(MAKELCID(MAKELANGID(LANG_GREEK, SUBLANG_DEFAULT), SORT_DEFAULT));
+        // A letter that only looks like one of the page is lacking, and a surrogate pair once.
+        bytes = Narrow(L"\u03A9\u0100\u00E4\U0001F600");
+    }).join();
+    EXPECT_EQ(bytes, "\xD9???");
+}
+
+TEST(WindowsLibrary, IsRegisteredWhileItIsLoaded)
+{
+    for (int i = 0; i < 2; ++i) {
+        const HMODULE library = LoadLibraryA(DCM_LIBRARY);
+        ASSERT_NE(library, nullptr);
+        const auto last = reinterpret_cast<CDynLinkLibrary* (*)() noexcept>(
+            reinterpret_cast<void*>(GetProcAddress(library, "_ZN15CDynLinkLibrary4LastEv")));
+        ASSERT_NE(last, nullptr);
+        ASSERT_NE(last(), nullptr);
+        EXPECT_EQ(last()->Module().hModule, library);
+        EXPECT_TRUE(FreeLibrary(library));
+        EXPECT_EQ(GetModuleHandleW(L"dcm.dll"), nullptr);
+    }
+}
