@@ -9,12 +9,6 @@
 namespace dcm {
 namespace {
 
-/// floor(log10(2^power)).
-constexpr int Exponent10(int power)
-{
-    return (power * 1'262'611) >> 22;
-}
-
 /// The significand of a power of ten: words from high to low, the highest bit set. Each step rounds
 /// down, by less than one unit of the last word, so that after 342 steps the exact significand is
 /// less than 2 x 342 units above.
@@ -82,7 +76,10 @@ constexpr auto MakePowers()
     return powers;
 }
 
-/// ToDecimal for the numbers that the product leaves open.
+} // namespace
+
+constexpr std::array<Power, kMaxPower - kMinPower + 1> kPowers = MakePowers();
+
 Decimal ToDecimalExactly(double value, int count) noexcept
 {
     std::array<char, 32> text; // d.ddde+xx
@@ -95,46 +92,6 @@ Decimal ToDecimalExactly(double value, int count) noexcept
     std::from_chars(letter[1] == '+' ? letter + 2 : letter + 1, end, decimal.exponent);
     decimal.exponent -= count - 1;
     return decimal;
-}
-
-} // namespace
-
-constexpr std::array<Power, kMaxPower - kMinPower + 1> kPowers = MakePowers();
-
-Decimal ToDecimal(double value, int count) noexcept
-{
-    // value = w x 2^exponent, the highest bit of w set.
-    const auto bits = std::bit_cast<std::uint64_t>(value);
-    const auto fraction = bits & ((std::uint64_t{1} << kFractionBits) - 1);
-    const auto biased = static_cast<int>(bits >> kFractionBits);
-    const auto whole = biased == 0 ? fraction : fraction | (std::uint64_t{1} << kFractionBits);
-    const int zeros = std::countl_zero(whole);
-    const auto w = whole << zeros;
-    const int exponent = (biased == 0 ? 1 : biased) - kExponentBias - kFractionBits - zeros;
-
-    // The first digit's power of ten: that of the power of two, or one more when the next power of
-    // ten lies between that and the value.
-    int first = Exponent10(exponent + 63);
-    const auto& next = kPowers[PowerIndex(first + 1)];
-    first += static_cast<int>(Exponent2(first + 1) == exponent + 63) &
-             static_cast<int>(w >= next.high + (next.low != 0 ? 1 : 0));
-
-    // H has `places` bits behind the point, besides its lower word.
-    const int last = first - count + 1;
-    const auto& power = kPowers[PowerIndex(-last)];
-    const auto h = uint128{w} * power.high + ((uint128{w} * power.low) >> 64);
-    const auto high = static_cast<std::uint64_t>(h >> 64);
-    const auto low = static_cast<std::uint64_t>(h);
-    const int places = -1 - exponent - Exponent2(-last);
-    const auto half = std::uint64_t{1} << (places - 1);
-    const auto behind = high & (2 * half - 1);
-    if (low + 1 <= 1 && behind + 1 - half <= 1) {
-        return ToDecimalExactly(value, count);
-    }
-    const auto digits = (high + half) >> places;
-    const auto limit =
-        std::uint64_t{count == 17 ? 100'000'000'000'000'000U : 1'000'000'000'000'000U};
-    return digits == limit ? Decimal{limit / 10, last + 1} : Decimal{digits, last};
 }
 
 } // namespace dcm

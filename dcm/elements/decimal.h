@@ -63,9 +63,51 @@ constexpr int Exponent2(int power)
     return (power * 217'706) >> 16;
 }
 
+/// floor(log10(2^power)).
+constexpr int Exponent10(int power)
+{
+    return (power * 1'262'611) >> 22;
+}
+
 /// `value`, finite and above zero, correctly rounded to `count` (15 or 17) significant digits, ties
-/// to even: `digits` has just that many.
-Decimal ToDecimal(double value, int count) noexcept;
+/// to even: `digits` has just that many. By the standard library.
+Decimal ToDecimalExactly(double value, int count) noexcept;
+
+/// ToDecimalExactly, for almost all numbers by one product.
+inline Decimal ToDecimal(double value, int count) noexcept
+{
+    const auto bits = std::bit_cast<std::uint64_t>(value);
+    const auto biased = static_cast<int>(bits >> kFractionBits);
+    if (biased == 0) {
+        return ToDecimalExactly(value, count);
+    }
+    // value = w x 2^exponent, the highest bit of w set.
+    const auto w = bits << (63 - kFractionBits) | kSignBit;
+    const int exponent = biased - kExponentBias - 63;
+
+    // The first digit's power of ten: that of the power of two, or one more when the next power of
+    // ten lies between that and the value.
+    int first = Exponent10(exponent + 63);
+    const auto& next = kPowers[PowerIndex(first + 1)];
+    first += static_cast<int>(Exponent2(first + 1) == exponent + 63) &
+             static_cast<int>(w >= next.high + (next.low != 0 ? 1 : 0));
+
+    // The upper word of H has `places` bits behind the point.
+    const int last = first - count + 1;
+    const auto& power = kPowers[PowerIndex(-last)];
+    const auto h = uint128{w} * power.high + ((uint128{w} * power.low) >> 64);
+    const auto high = static_cast<std::uint64_t>(h >> 64);
+    const auto low = static_cast<std::uint64_t>(h);
+    const int places = -1 - exponent - Exponent2(-last);
+    const auto half = std::uint64_t{1} << (places - 1);
+    const auto behind = high & (2 * half - 1);
+    if (behind + 1 - half <= 1 && low + 1 <= 1) {
+        return ToDecimalExactly(value, count);
+    }
+    const auto digits = (high + half) >> places;
+    const auto limit = count == 17 ? 10 * kTenTo16 : kTenTo16 / 10;
+    return digits == limit ? Decimal{limit / 10, last + 1} : Decimal{digits, last};
+}
 
 /// Stores the double nearest to `decimal` and returns true; false when this way cannot tell, as for
 /// one number of many digits in five hundred, or when the result is not a normal number.
@@ -150,12 +192,13 @@ constexpr std::uint64_t JoinEight(std::uint64_t bytes)
 constexpr std::uint64_t SplitEight(std::uint64_t number)
 {
     // Each step divides all parts at once, by a product with the rounded-up reciprocal that is
-    // exact for parts this small; quotient and remainder share the part's room.
-    const auto halves = number / 10'000 + ((number % 10'000) << 32);
-    const auto hundreds = ((halves * 10'486) >> 20) & 0x0000'007F'0000'007F;
-    const auto quarters = hundreds + ((halves - hundreds * 100) << 16);
-    const auto tens = ((quarters * 103) >> 10) & 0x000F'000F'000F'000F;
-    return tens + ((quarters - tens * 10) << 8);
+    // exact for parts this small. The quotient q takes the lower half of the part's room and the
+    // remainder n - q x d the upper half: together (n << half) - q x ((d << half) - 1).
+    const auto two = (number << 32) - number / 10'000 * ((std::uint64_t{10'000} << 32) - 1);
+    const auto hundreds = ((two * 10'486) >> 20) & 0x0000'007F'0000'007F;
+    const auto four = (two << 16) - hundreds * ((100 << 16) - 1);
+    const auto tens = ((four * 103) >> 10) & 0x000F'000F'000F'000F;
+    return (four << 8) - tens * ((10 << 8) - 1);
 }
 
 } // namespace dcm

@@ -9,6 +9,7 @@
 #include <charconv>
 #include <cstdint>
 #include <cstdlib>
+#include <cstring>
 #include <limits>
 #include <string_view>
 #include <system_error>
@@ -52,10 +53,10 @@ std::wstring_view SpecialName(std::uint64_t bits)
     return (bits & quietBit) != 0 ? L"1.#QNAN" : L"1.#SNAN";
 }
 
-/// Writes the digits 0 to 9 in the bytes of `digits`, the lowest byte first.
-void WriteEight(std::uint64_t digits, wchar_t* to)
+/// Writes the sixteen characters in the bytes of `text`, the lowest byte first.
+void WriteSixteen(uint128 text, wchar_t* to)
 {
-    const auto bytes = std::bit_cast<std::array<unsigned char, 8>>(digits | 0x3030'3030'3030'3030);
+    const auto bytes = std::bit_cast<std::array<unsigned char, 16>>(text);
     for (std::size_t i = 0; i < bytes.size(); ++i) {
         to[i] = bytes[i];
     }
@@ -291,40 +292,35 @@ wchar_t* WriteNumber(double value, int digits, wchar_t* to) noexcept
     }
     const auto decimal = ToDecimal(std::bit_cast<double>(magnitude), digits);
     const int exponent = decimal.exponent + digits - 1;
-    // The first of seventeen digits, and two words of eight.
+    // The first of seventeen digits, and the other sixteen.
     const auto whole = digits == 17 ? decimal.digits : decimal.digits * 100;
     const auto first = static_cast<wchar_t>(L'0' + whole / kTenTo16);
     const auto upper = SplitEight(whole % kTenTo16 / kTenTo8);
     const auto lower = SplitEight(whole % kTenTo8);
+    const auto others = (uint128{lower | EightTimes('0')} << 64) | (upper | EightTimes('0'));
+    // The last digit that is not 0, found without a branch: long and short numbers come mixed.
+    const auto used = lower != 0 ? ~std::uint64_t{0} : 0;
     const int count =
-        lower != 0 ? 17 - std::countl_zero(lower) / 8 : 9 - std::countl_zero(upper) / 8;
+        9 + static_cast<int>(used & 8) - std::countl_zero(upper ^ ((upper ^ lower) & used)) / 8;
 
-    if (exponent >= 0 && exponent < digits) {
-        // All digits, then over them those of the fraction again, behind the point.
+    if (exponent < kFixedMin || exponent >= digits) {
         to[0] = first;
-        WriteEight(upper, to + 1);
-        WriteEight(lower, to + 9);
-        to[exponent + 1] = L'.';
-        const auto fraction = ((uint128{lower} << 64) | upper) >> std::min(8 * exponent, 127);
-        WriteEight(static_cast<std::uint64_t>(fraction), to + exponent + 2);
-        if (exponent < 8) {
-            WriteEight(static_cast<std::uint64_t>(fraction >> 64), to + exponent + 10);
-        }
-        return to + std::max(count, exponent + 2) + 1;
+        to[1] = L'.';
+        WriteSixteen(others, to + 2);
+        return WriteExponent(exponent, to + (count > 1 ? count + 1 : 1));
     }
-    if (exponent >= kFixedMin && exponent < 0) {
-        std::ranges::copy(L"0.000"sv, to);
-        to += 1 - exponent;
-        to[0] = first;
-        WriteEight(upper, to + 1);
-        WriteEight(lower, to + 9);
-        return to + count;
-    }
+    // Below 1, zeros and the point stand in front of the digits. From 1 on the point goes behind as
+    // many of the others as the exponent says; those behind it move by a byte, the last one out.
+    constexpr wchar_t zeros[] = {L'0', L'.', L'0', L'0', L'0'};
+    std::memcpy(to, zeros, sizeof zeros);
+    to += exponent < 0 ? 1 - exponent : 0;
+    const auto point = uint128{exponent >= 0 && exponent < 16 ? 1U : 0U} << (8 * (exponent & 15));
+    const auto front = others & (point - 1);
     to[0] = first;
-    to[1] = L'.';
-    WriteEight(upper, to + 2);
-    WriteEight(lower, to + 10);
-    return WriteExponent(exponent, to + (count > 1 ? count + 1 : 1));
+    WriteSixteen(front | (others ^ front) << 8 | point * '.', to + 1);
+    to[17] = exponent < 16 ? static_cast<wchar_t>(others >> 120) : L'.';
+    to[18] = L'0';
+    return to + std::max(count, exponent + 2) + (exponent < 0 ? 0 : 1);
 }
 
 double ReadDecimal(std::wstring_view text) noexcept
