@@ -1,0 +1,151 @@
+#pragma once
+
+#include "dcm/elements/number.h"
+
+#include <algorithm>
+#include <array>
+#include <bit>
+#include <charconv>
+#include <cmath>
+#include <cstddef>
+#include <cstdint>
+#include <limits>
+#include <random>
+#include <string>
+#include <string_view>
+#include <system_error>
+
+/// Numbers and number texts of every kind from a seed: those that are frequent in files, and those
+/// that are hard to round.
+class NumberSource
+{
+public:
+    explicit NumberSource(std::uint64_t seed) : m_random(seed) {}
+
+    /// A finite number.
+    double Number()
+    {
+        double number = 0;
+        switch (Below(6)) {
+        case 0:
+            number = std::bit_cast<double>(m_random());
+            break;
+        case 1: // short decimals
+            number = static_cast<double>(Digits()) / std::pow(10, Below(20));
+            break;
+        case 2: // halves, quarters and on
+            number = std::ldexp(static_cast<double>(Digits()), -Below(64));
+            break;
+        case 3:
+            number = Neighbour(std::ldexp(1.0, Below(2098) - 1074));
+            break;
+        case 4:
+            number = Neighbour(Parse("1e" + std::to_string(Below(632) - 323)));
+            break;
+        default: // denormals
+            number = std::bit_cast<double>(m_random() >> (12 + Below(52)));
+        }
+        number = Below(2) == 0 ? -number : number;
+        return std::isfinite(number) ? number : 0.5;
+    }
+
+    /// A text that is a decimal number as a whole.
+    std::string Text()
+    {
+        std::array<char, 1600> buffer;
+        char* const begin = buffer.data();
+        char* const end = begin + buffer.size();
+        const double number = Number();
+        const int kind = Below(16);
+        if (kind < 6)
+            return {begin, std::to_chars(begin, end, number).ptr};
+        if (kind < 12) {
+            constexpr std::chars_format formats[] = {std::chars_format::general,
+                                                     std::chars_format::scientific,
+                                                     std::chars_format::fixed};
+            return {begin, std::to_chars(begin, end, number, formats[Below(3)], Below(25)).ptr};
+        }
+        if (kind == 12) { // half-way between two numbers, or a little above
+            const auto next = std::nextafter(number, std::numeric_limits<double>::max());
+            const auto half = (static_cast<long double>(number) + next) / 2;
+            std::string text(
+                begin, std::to_chars(begin, end, half, std::chars_format::scientific, 780).ptr);
+            text[text.find('e') - 1] = "01"[Below(2)];
+            return text;
+        }
+        std::string text;
+        for (int i = 1 + Below(Below(4) == 0 ? 400 : 24); i > 0; --i)
+            text += "0123456789"[Below(10)];
+        text.insert(static_cast<std::size_t>(Below(static_cast<int>(text.size()))), ".");
+        text = Below(2) == 0 ? text : text + 'e' + std::to_string(Below(800) - 400);
+        return Below(2) == 0 ? text : '-' + text;
+    }
+
+    /// What the standard library reads, with infinity and zero where it finds no number.
+    static double Parse(std::string_view text)
+    {
+        const char* const end = text.data() + text.size();
+        double value = 0;
+        if (std::from_chars(text.data(), end, value).ec == std::errc::result_out_of_range) {
+            long double wider = 0;
+            std::from_chars(text.data(), end, wider);
+            value = static_cast<double>(wider);
+        }
+        return value;
+    }
+
+private:
+    int Below(int limit) { return static_cast<int>(m_random() % static_cast<unsigned>(limit)); }
+    std::uint64_t Digits() { return m_random() >> (11 + Below(53)); }
+    double Neighbour(double number)
+    {
+        return std::nextafter(number, Below(3) == 0 ? number : Below(2) * 2 * number);
+    }
+
+    std::mt19937_64 m_random;
+};
+
+/// What is wrong with the text of a finite number by the standard library's measure; empty if
+/// nothing is.
+inline std::string WrongText(double number)
+{
+    for (const int digits : {dcm::kFullDigits, dcm::kShortDigits}) {
+        std::array<char, 64> buffer;
+        buffer[0] = ' ';
+        std::string expected(buffer.data(),
+                             std::to_chars(buffer.data() + 1, buffer.data() + buffer.size(), number,
+                                           std::chars_format::general, digits)
+                                 .ptr);
+        const auto letter = expected.find('e');
+        if (letter != expected.npos)
+            expected.insert(letter + 2, expected.size() - letter == 4 ? 1 : 0, '0');
+        else if (expected.find('.') == expected.npos)
+            expected += ".0";
+        std::array<wchar_t, dcm::kNumberTextMax + 1> text;
+        text.back() = L'x';
+        const wchar_t* const end = dcm::WriteNumber(number, digits, text.data());
+        if (text.back() != L'x')
+            return expected + " took more than its room";
+        if (!std::equal(static_cast<const wchar_t*>(text.data()), end, expected.begin(),
+                        expected.end()))
+            return "not" + expected + " but" +
+                   std::string(static_cast<const wchar_t*>(text.data()), end);
+    }
+    return {};
+}
+
+/// The same for a decimal number read from its text, alone and as the first of two in a line.
+inline std::string WrongNumber(const std::string& text)
+{
+    const double expected = NumberSource::Parse(text);
+    const std::wstring line = std::wstring(text.begin(), text.end()) + L"   2.5";
+    std::wstring_view rest = line;
+    double taken = 1;
+    if (!dcm::TakeNumber(rest, taken) || rest != L"2.5")
+        return "the next number behind " + text;
+    const double read = dcm::ReadNumber(std::wstring_view(line).substr(0, text.size()));
+    for (const double number : {read, taken})
+        if (std::bit_cast<std::uint64_t>(number) != std::bit_cast<std::uint64_t>(expected))
+            return text + " is " + std::to_string(number);
+    return {};
+}
