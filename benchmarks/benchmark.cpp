@@ -12,7 +12,6 @@
 #include <iostream>
 #include <iterator>
 #include <map>
-#include <memory>
 #include <stdexcept>
 #include <string>
 #include <string_view>
@@ -34,26 +33,41 @@ std::string FileText(const std::filesystem::path& path)
     return {std::istreambuf_iterator<char>(file), {}};
 }
 
-void SetUp(Stage& stage, const std::filesystem::path& folder, Flavour flavour, double factor)
+/// Fills a stage for the library alone, or for all contestants.
+void SetUp(Stage& stage, const std::filesystem::path& folder, Flavour flavour, double factor,
+           bool forAll)
 {
     stage.data = MakeData(flavour, factor);
-    stage.narrowData = In1252(stage.data);
     const std::string name = "factor-" + std::to_string(factor);
     stage.dcmFile = folder / (name + ".dcm");
     stage.jsonFile = folder / (name + ".json");
     stage.outputFile = folder / (name + ".out");
     WriteFile(stage.dcmFile, DcmText(stage.data));
-    WriteFile(stage.jsonFile, JsonText(stage.data));
     if (stage.document.Import(CString(stage.dcmFile.c_str())) != S_OK)
         throw std::runtime_error("import failed");
+    if (!forAll)
+        return;
+    stage.narrowData = In1252(stage.data);
+    WriteFile(stage.jsonFile, JsonText(stage.data));
+    for (const Block& block : stage.data.blocks) {
+        for (const double number : block.values) {
+            constexpr std::size_t enough = 4096;
+            if (stage.someNumbers.size() < enough && block.values.size() > 1)
+                stage.someNumbers.push_back(number);
+        }
+    }
+    for (const double number : stage.someNumbers) {
+        stage.someTexts.append(stage.someTexts.empty() ? 0 : 3, ' ');
+        AppendNumber(stage.someTexts, number, flavour);
+    }
+    stage.someWideTexts.assign(stage.someTexts.begin(), stage.someTexts.end());
 }
 
 /// A contestant that does something else than the others is worth nothing: all who read have to
 /// get the numbers of the data, and those who write what the library writes have to write the same
 /// file.
-void Check(const Stage& stage, const Contestant& contestant)
+void Check(const Stage& stage, const Contestant& contestant, std::string& exported)
 {
-    static std::string exported;
     const Outcome outcome = contestant.run(stage);
     if (contestant.name.starts_with("import/") && outcome.checksum != stage.data.checksum)
         throw std::runtime_error(contestant.name + " reads other numbers");
@@ -105,7 +119,6 @@ private:
 
 void Register(const Stage& stage, const Contestant& contestant, const std::string& name)
 {
-    Check(stage, contestant);
     benchmark::RegisterBenchmark(name.c_str(),
                                  [&stage, &contestant](benchmark::State& state) {
                                      for ([[maybe_unused]] auto _ : state) {
@@ -141,21 +154,18 @@ int Main(int argc, char** argv)
     const std::string growth = Argument(argc, argv, "--growth", "");
 
     const TemporaryFolder folder;
-    std::vector<std::unique_ptr<Stage>> stages;
-    const auto addStage = [&](double size) -> const Stage& {
-        stages.push_back(std::make_unique<Stage>());
-        SetUp(*stages.back(), folder.Path(), flavour, size);
-        return *stages.back();
-    };
-    const Stage& stage = addStage(factor);
-    std::cerr << stage.data.numbers << " numbers in " << stage.data.blocks.size() << " blocks, "
-              << std::filesystem::file_size(stage.dcmFile) << " bytes\n";
-    for (const Contestant& contestant : Contestants())
+    Stage stage;
+    SetUp(stage, folder.Path(), flavour, factor, true);
+    std::string exported;
+    for (const Contestant& contestant : Contestants()) {
+        Check(stage, contestant, exported);
         Register(stage, contestant, contestant.name);
+    }
+    Stage large;
     if (!growth.empty()) {
-        const Stage& large = addStage(factor * std::stod(growth));
+        SetUp(large, folder.Path(), flavour, factor * std::stod(growth), false);
         for (const Contestant& contestant : Contestants()) {
-            if (contestant.name.ends_with("/dcm"))
+            if (contestant.name == "import/dcm" || contestant.name == "export/dcm")
                 Register(large, contestant, contestant.name + "-large");
         }
     }
@@ -167,12 +177,6 @@ int Main(int argc, char** argv)
 }
 
 } // namespace
-
-std::vector<Contestant>& Contestants()
-{
-    static std::vector<Contestant> contestants;
-    return contestants;
-}
 
 } // namespace dcm::bench
 

@@ -3,6 +3,9 @@
 #include "benchmarks/data.h"
 #include "dcm/converter/dcmconverter.h"
 
+#include <benchmark/benchmark.h>
+
+#include <cstddef>
 #include <cstdint>
 #include <ctime>
 #include <filesystem>
@@ -22,6 +25,11 @@ struct Stage
     Data narrowData;
     /// The same as a document.
     DCMConverter document;
+    /// Some of the numbers, few enough to stay in the processor's cache with their texts, and a
+    /// line of these texts with three blanks between them.
+    std::vector<double> someNumbers;
+    std::string someTexts;
+    std::wstring someWideTexts;
     std::filesystem::path dcmFile;
     std::filesystem::path jsonFile;
     std::filesystem::path outputFile;
@@ -69,6 +77,30 @@ auto Timed(double& seconds, Work work)
     };
     const Clock clock{seconds};
     return work();
+}
+
+/// How often the routines for some numbers run, to have had as many as the data have.
+inline std::size_t Repetitions(const Stage& stage)
+{
+    return stage.data.numbers / stage.someNumbers.size();
+}
+
+/// Times `write`, which writes a number at a place in memory and returns the text's end.
+template <class Character, class Write>
+Outcome TimedNumberTexts(const Stage& stage, Write write)
+{
+    Outcome outcome;
+    std::vector<Character> text(stage.someNumbers.size() * 40);
+    Timed(outcome.seconds, [&] {
+        for (std::size_t i = Repetitions(stage); i > 0; --i) {
+            Character* to = text.data();
+            for (const double number : stage.someNumbers)
+                to = write(number, to);
+            benchmark::DoNotOptimize(to);
+            benchmark::ClobberMemory();
+        }
+    });
+    return outcome;
 }
 
 /// What a reader other than the library makes: the numbers of each block.

@@ -94,21 +94,6 @@ private:
     std::size_t m_count = 0;
 };
 
-void AppendNumber(std::string& text, double number, Flavour flavour)
-{
-    std::array<char, 40> digits;
-    const char* const end =
-        flavour == Flavour::kFull
-            ? std::to_chars(digits.data(), digits.data() + digits.size(), number,
-                            std::chars_format::general, 17)
-                  .ptr
-            : std::to_chars(digits.data(), digits.data() + digits.size(), number).ptr;
-    const std::string_view written(digits.data(), static_cast<std::size_t>(end - digits.data()));
-    text += written;
-    if (written.find_first_of(".e") == written.npos)
-        text += ".0";
-}
-
 void AppendDcmNumbers(std::string& text, std::string_view keyword, std::span<const double> numbers,
                       Flavour flavour)
 {
@@ -259,6 +244,21 @@ Data MakeData(Flavour flavour, double factor, std::uint64_t seed)
     }
     data.checksum = checksum.Value();
     return data;
+}
+
+void AppendNumber(std::string& text, double number, Flavour flavour)
+{
+    std::array<char, 40> digits;
+    const char* const end =
+        flavour == Flavour::kFull
+            ? std::to_chars(digits.data(), digits.data() + digits.size(), number,
+                            std::chars_format::general, 17)
+                  .ptr
+            : std::to_chars(digits.data(), digits.data() + digits.size(), number).ptr;
+    const std::string_view written(digits.data(), static_cast<std::size_t>(end - digits.data()));
+    text += written;
+    if (written.find_first_of(".e") == written.npos)
+        text += ".0";
 }
 
 std::string DcmText(const Data& data)

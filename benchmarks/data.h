@@ -53,6 +53,9 @@ struct Data
 /// the same arguments, on every machine.
 Data MakeData(Flavour flavour, double factor, std::uint64_t seed = 1);
 
+/// The text of `number` as it stands in the files.
+void AppendNumber(std::string& text, double number, Flavour flavour);
+
 /// The data as a file in DCM format, in code page 1252: six numbers a line, CR LF.
 std::string DcmText(const Data& data);
 

@@ -1,5 +1,6 @@
 #include "benchmarks/contestant.h"
 
+#include "dcm/elements/number.h"
 #include "dcm/library/dcm.h"
 
 #include <stdexcept>
@@ -72,6 +73,27 @@ const TakesPart kExport("export/dcm", [](const Stage& stage) {
     const CString path(stage.outputFile.c_str());
     if (Timed(outcome.seconds, [&] { return stage.document.Export(path); }) != S_OK)
         throw std::runtime_error("export failed");
+    return outcome;
+});
+
+const TakesPart kNumberText("text/dcm", [](const Stage& stage) {
+    return TimedNumberTexts<wchar_t>(
+        stage, [](double number, wchar_t* to) { return WriteNumber(number, 17, to); });
+});
+
+const TakesPart kNumberToken("token/dcm", [](const Stage& stage) {
+    Outcome outcome;
+    Timed(outcome.seconds, [&] {
+        for (std::size_t i = Repetitions(stage); i > 0; --i) {
+            std::wstring_view rest = stage.someWideTexts;
+            bool more = true;
+            while (more) {
+                double number = 0;
+                more = TakeNumber(rest, number);
+                benchmark::DoNotOptimize(number);
+            }
+        }
+    });
     return outcome;
 });
 

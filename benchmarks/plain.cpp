@@ -224,6 +224,27 @@ const TakesPart kReadNaively("import/naive", [](const Stage& stage) {
     return TimedRead([&] { return ReadNaively(stage.dcmFile); });
 });
 
+const TakesPart kToChars("text/to_chars", [](const Stage& stage) {
+    return TimedNumberTexts<char>(stage, [](double number, char* to) {
+        return std::to_chars(to, to + 40, number, std::chars_format::general, 17).ptr;
+    });
+});
+
+const TakesPart kFromChars("token/from_chars", [](const Stage& stage) {
+    Outcome outcome;
+    Timed(outcome.seconds, [&] {
+        for (std::size_t i = Repetitions(stage); i > 0; --i) {
+            for (std::string_view rest = stage.someTexts; !rest.empty();) {
+                const std::string_view token = TakeWord(rest);
+                double number = 0;
+                std::from_chars(token.data(), token.data() + token.size(), number);
+                benchmark::DoNotOptimize(number);
+            }
+        }
+    });
+    return outcome;
+});
+
 const TakesPart kWriteFloor("export/floor", WritePlainly<Digits::kToChars>);
 
 const TakesPart kWriteNaively("export/snprintf", WritePlainly<Digits::kSnprintf>);
@@ -251,7 +272,7 @@ BlockNumbers ReadFloor(const std::filesystem::path& path)
         if (line.ends_with('\r'))
             line.remove_suffix(1);
         if (line.empty()) {
-            blocks.push_back(std::move(numbers));
+            blocks.push_back(numbers);
             numbers.clear();
             continue;
         }

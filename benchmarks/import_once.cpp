@@ -1,0 +1,29 @@
+// import_once dcm|floor FILE
+// What the first reading of a file costs in a fresh process, that of a host of the shared library:
+// prints its time in seconds and the peak memory of the process in bytes.
+
+#include "benchmarks/memory.h"
+#include "benchmarks/plain.h"
+#include "dcm/library/dcm.h"
+
+#include <cstdlib>
+#include <iostream>
+#include <string_view>
+
+int main(int argc, char** argv)
+{
+    using namespace dcm::bench;
+    if (argc != 3) {
+        std::cerr << "usage: import_once dcm|floor FILE\n";
+        return EXIT_FAILURE;
+    }
+    double seconds = 0;
+    if (argv[1] == std::string_view("floor")) {
+        const BlockNumbers blocks = Timed(seconds, [&] { return ReadFloor(argv[2]); });
+    } else {
+        DCMConverter document;
+        if (Timed(seconds, [&] { return document.Import(CString(argv[2])); }) != S_OK)
+            return EXIT_FAILURE;
+    }
+    std::cout << "{\"seconds\": " << seconds << ", \"peak\": " << PeakMemory() << "}\n";
+}
