@@ -102,7 +102,8 @@ TEST(RoundTrip, LeavesNoMemoryBehind)
             EXPECT_EQ(ShowAll(points), "'c' 'd'");
             block = map;
         }
-        EXPECT_GT(LiveAllocations(), before + 8000);
+        // Texts of variants are the system's on Windows, and not counted.
+        EXPECT_GT(LiveAllocations(), before + 4000);
     }
     EXPECT_EQ(LiveAllocations(), before);
 }
