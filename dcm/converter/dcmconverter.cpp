@@ -44,8 +44,7 @@ constexpr std::wstring_view kCommentMark = L"* ";
 
 } // namespace
 
-DCMConverter::DCMConverter() : m_bBlockSeen(0)
-{}
+DCMConverter::DCMConverter() = default;
 
 DCMConverter& DCMConverter::operator=(const DCMConverter& other)
 {
@@ -244,8 +243,9 @@ HRESULT DCMConverter::Export(const CString& strPath) const
         HRESULT result = S_OK;
         CFileStatus status;
         if (file.GetStatus(status)) {
-            result = WriteHeader(file);
-            result = WriteFormat(file);
+            // Every writer returns 0: what fails is thrown.
+            WriteHeader(file);
+            WriteFormat(file);
             for (const BlockKind& kind : kBlockKinds)
                 result = (this->*kind.write)(file);
             file.Close();

@@ -132,6 +132,6 @@ private:
     std::list<DCMGruppenkennfeld> m_listGruppenkennfeld;
     std::list<DCMTextstring> m_listTextstring;
     /// Whether a block of a known kind has been met in this import: it ends the comment.
-    std::int32_t m_bBlockSeen;
+    std::int32_t m_bBlockSeen = 0;
     CString m_strComment;
 };

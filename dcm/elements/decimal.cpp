@@ -41,19 +41,20 @@ public:
 
     constexpr Power Upper() const
     {
-        if (m_word[2] > std::numeric_limits<std::uint64_t>::max() - 2 * 342) {
+        if (m_word[2] > std::numeric_limits<std::uint64_t>::max() - std::uint64_t{2} * 342) {
             throw "a carry into the upper words could be lost"; // Stops the compiler.
         }
         return {m_word[0], m_word[1]};
     }
 
 private:
-    /// Shifts `top` into the words from above, down to its highest bit.
+    /// Shifts `top`, which is not 0, into the words from above, down to its highest bit.
     constexpr void Normalise(std::uint64_t top)
     {
         const int bits = 64 - std::countl_zero(top);
         for (auto& word : m_word) {
             const auto lower = word;
+            // NOLINTNEXTLINE(clang-analyzer-core.UndefinedBinaryOperatorResult): `bits` is not 0.
             word = (top << (64 - bits)) | (lower >> bits);
             top = lower;
         }

@@ -22,6 +22,7 @@
 namespace dcm {
 
 /// Like std::uint64_t, twice as wide.
+// NOLINTNEXTLINE(modernize-use-using): only a typedef can carry the mark of an extension.
 __extension__ typedef unsigned __int128 uint128;
 
 constexpr std::uint64_t kTenTo8 = 100'000'000;

@@ -83,16 +83,21 @@ HRESULT DCMFestwert::Init(const CString& strBlock)
             m_strUnit = rest;
         else if (line.Is(dcm::keyword::kWert))
             m_value = dcm::ReadNumber(rest);
-        else if (!line.Is(dcm::keyword::kText))
-            continue;
-        else if (text == L"true")
-            m_value = 1.0;
-        else if (text == L"false")
-            m_value = 0.0;
-        else
-            m_value.SetText(dcm::TrimQuotes(dcm::TrimWhite(text)));
+        else if (line.Is(dcm::keyword::kText))
+            ReadText(text);
     }
     return S_OK;
+}
+
+/// Truth words are numbers; in these letters only.
+void DCMFestwert::ReadText(std::wstring_view text)
+{
+    if (text == L"true")
+        m_value = 1.0;
+    else if (text == L"false")
+        m_value = 0.0;
+    else
+        m_value.SetText(dcm::TrimQuotes(dcm::TrimWhite(text)));
 }
 
 HRESULT DCMFestwert::Export(PravFile& file)

@@ -6,6 +6,8 @@
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
 
+#include <string_view>
+
 /// One FESTWERT: a named single value, a number or a text, with its unit.
 class DCM_API DCMFestwert : public DCMBaseType
 {
@@ -57,6 +59,7 @@ protected:
 
 private:
     friend class DCMConverter;
+    void ReadText(std::wstring_view text);
     /// Composes the block in `block`, which is empty before.
     void ComposeBlock(CString& block) const;
 

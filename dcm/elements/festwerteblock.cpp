@@ -40,8 +40,7 @@ bool AnotherTextFollows(std::wstring_view rest)
 
 } // namespace
 
-DCMFestwerteblock::DCMFestwerteblock() : m_nXValueCount(0), m_nYValueCount(0)
-{}
+DCMFestwerteblock::DCMFestwerteblock() = default;
 
 DCMFestwerteblock& DCMFestwerteblock::operator=(const DCMFestwerteblock& other)
 {

@@ -80,6 +80,6 @@ private:
     /// Lists in the interface; an array here, since a list takes four times the memory.
     std::vector<double> m_vecDoubleValues;
     std::list<CString> m_listStringValues;
-    std::int32_t m_nXValueCount;
-    std::int32_t m_nYValueCount;
+    std::int32_t m_nXValueCount = 0;
+    std::int32_t m_nYValueCount = 0;
 };

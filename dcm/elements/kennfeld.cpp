@@ -12,9 +12,7 @@
 #include <span>
 #include <utility>
 
-DCMKennfeld::DCMKennfeld()
-    : m_strKeyword(dcm::keyword::kKennfeld), m_vtValueType(VT_EMPTY), m_vtAxisXType(VT_EMPTY),
-      m_vtAxisYType(VT_EMPTY), m_nAxisLengthX(0), m_nAxisLengthY(0)
+DCMKennfeld::DCMKennfeld() : m_strKeyword(dcm::keyword::kKennfeld)
 {}
 
 DCMKennfeld& DCMKennfeld::operator=(const DCMKennfeld& other)

@@ -123,11 +123,11 @@ private:
     std::vector<CComVariant> m_vecAxisX;
     std::vector<CComVariant> m_vecAxisY;
     std::vector<CComVariant> m_vecValues;
-    VARTYPE m_vtValueType;
-    VARTYPE m_vtAxisXType;
-    VARTYPE m_vtAxisYType;
-    std::int32_t m_nAxisLengthX;
-    std::int32_t m_nAxisLengthY;
+    VARTYPE m_vtValueType = VT_EMPTY;
+    VARTYPE m_vtAxisXType = VT_EMPTY;
+    VARTYPE m_vtAxisYType = VT_EMPTY;
+    std::int32_t m_nAxisLengthX = 0;
+    std::int32_t m_nAxisLengthY = 0;
     CString m_strStuetzstellenverteilungX;
     CString m_strStuetzstellenverteilungY;
 };

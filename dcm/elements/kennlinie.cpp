@@ -10,9 +10,7 @@
 
 #include <utility>
 
-DCMKennlinie::DCMKennlinie()
-    : m_strKeyword(dcm::keyword::kKennlinie), m_vtValueType(VT_EMPTY), m_vtAxisType(VT_EMPTY),
-      m_nAxisLengthX(0)
+DCMKennlinie::DCMKennlinie() : m_strKeyword(dcm::keyword::kKennlinie)
 {}
 
 DCMKennlinie& DCMKennlinie::operator=(const DCMKennlinie& other)

@@ -107,9 +107,9 @@ private:
     std::list<double> m_listValues;
     std::vector<CComVariant> m_vecAxis;
     std::vector<CComVariant> m_vecValues;
-    VARTYPE m_vtValueType;
-    VARTYPE m_vtAxisType;
-    std::int32_t m_nAxisLengthX;
+    VARTYPE m_vtValueType = VT_EMPTY;
+    VARTYPE m_vtAxisType = VT_EMPTY;
+    std::int32_t m_nAxisLengthX = 0;
     CString m_strStuetzstellenverteilung;
 };
 

@@ -8,8 +8,7 @@
 
 #include <string_view>
 
-DCMKonservierungsFormat::DCMKonservierungsFormat() : m_dValue(0.0)
-{}
+DCMKonservierungsFormat::DCMKonservierungsFormat() = default;
 
 DCMKonservierungsFormat::~DCMKonservierungsFormat() = default;
 

@@ -30,5 +30,5 @@ public:
     HRESULT Export(PravFile& file) const;
 
 private:
-    double m_dValue;
+    double m_dValue = 0.0;
 };

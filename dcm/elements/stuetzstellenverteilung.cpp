@@ -10,8 +10,7 @@
 
 #include <utility>
 
-DCMStuetzstellenverteilung::DCMStuetzstellenverteilung() : m_vtValueType(VT_EMPTY)
-{}
+DCMStuetzstellenverteilung::DCMStuetzstellenverteilung() = default;
 
 DCMStuetzstellenverteilung&
 DCMStuetzstellenverteilung::operator=(const DCMStuetzstellenverteilung& other)

@@ -65,5 +65,5 @@ private:
 
     CString m_strUnit;
     std::vector<CComVariant> m_vecValues;
-    VARTYPE m_vtValueType;
+    VARTYPE m_vtValueType = VT_EMPTY;
 };

@@ -74,8 +74,9 @@ BOOL CFile::Open(const wchar_t* path, UINT flags, CFileException* error)
 
 BOOL CFile::GetStatus(CFileStatus& status) const
 {
-    return m_handle != dcm::system::kNoFile &&
-           dcm::system::FileLength(m_handle, status.m_size) == 0;
+    const bool known =
+        m_handle != dcm::system::kNoFile && dcm::system::FileLength(m_handle, status.m_size) == 0;
+    return known ? TRUE : FALSE;
 }
 
 ULONGLONG CFile::GetLength() const

@@ -147,38 +147,47 @@ void Replace1252(std::string_view bytes, wchar_t* wide)
     replacePiece(last);
 }
 
+/// What may follow the first byte of a character in UTF-8.
+struct Utf8Lead
+{
+    /// Bytes of the character; 0 for a byte that begins none.
+    std::size_t length;
+    /// The second byte lies from `low` to `high`: neither overlong forms nor surrogates nor numbers
+    /// above U+10FFFF.
+    unsigned low = 0x80;
+    unsigned high = 0xBF;
+};
+
+Utf8Lead LeadOf(unsigned byte)
+{
+    if (byte < 0x80)
+        return {1};
+    if (byte < 0xC2 || byte > 0xF4)
+        return {0};
+    if (byte < 0xE0)
+        return {2};
+    if (byte < 0xF0)
+        return {3, byte == 0xE0 ? 0xA0U : 0x80U, byte == 0xED ? 0x9FU : 0xBFU};
+    return {4, byte == 0xF0 ? 0x90U : 0x80U, byte == 0xF4 ? 0x8FU : 0xBFU};
+}
+
 /// One character at the start of `bytes` (not empty), its bytes taken off. A byte that begins no
 /// whole character is taken alone, a cut one as far as it goes.
 std::uint32_t TakeUtf8(std::string_view& bytes)
 {
     const auto byte = [&](std::size_t i) { return static_cast<unsigned char>(bytes[i]); };
-    const unsigned lead = byte(0);
-    const std::size_t length = lead < 0x80    ? 1
-                               : lead < 0xC2  ? 0
-                               : lead < 0xE0  ? 2
-                               : lead < 0xF0  ? 3
-                               : lead <= 0xF4 ? 4
-                                              : 0;
-    std::uint32_t c = length < 2 ? lead : lead & (0x7FU >> length);
+    Utf8Lead lead = LeadOf(byte(0));
+    std::uint32_t c = lead.length < 2 ? byte(0) : byte(0) & (0x7FU >> lead.length);
     std::size_t taken = 1;
-    while (taken < length && taken < bytes.size()) {
-        const unsigned next = byte(taken);
-        // Neither overlong forms nor surrogates nor numbers above U+10FFFF.
-        const unsigned low = taken > 1      ? 0x80U
-                             : lead == 0xE0 ? 0xA0U
-                             : lead == 0xF0 ? 0x90U
-                                            : 0x80U;
-        const unsigned high = taken > 1      ? 0xBFU
-                              : lead == 0xED ? 0x9FU
-                              : lead == 0xF4 ? 0x8FU
-                                             : 0xBFU;
-        if (next < low || next > high)
+    for (; taken < lead.length && taken < bytes.size(); ++taken) {
+        if (byte(taken) < lead.low || byte(taken) > lead.high)
             break;
-        c = (c << 6) | (next & 0x3FU);
-        ++taken;
+        c = (c << 6) | (byte(taken) & 0x3FU);
+        lead.low = 0x80;
+        lead.high = 0xBF;
     }
     bytes.remove_prefix(taken);
-    return length != 0 && taken == length ? c : kReplacement;
+    return taken == lead.length ? c : kReplacement;
 }
 
 wchar_t* PutWide(std::uint32_t c, wchar_t* to)

@@ -100,7 +100,7 @@ int CString::CompareNoCase(std::wstring_view other) const noexcept
     const auto order = std::lexicographical_compare_three_way(
         own.begin(), own.end(), other.begin(), other.end(),
         [](wchar_t a, wchar_t b) { return dcm::FoldCase(a) <=> dcm::FoldCase(b); });
-    return order < 0 ? -1 : order > 0 ? 1 : 0;
+    return std::is_lt(order) ? -1 : std::is_gt(order) ? 1 : 0;
 }
 
 void CString::Empty() noexcept

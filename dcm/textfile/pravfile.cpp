@@ -42,10 +42,9 @@ dcm::FileText WithCrLf(const dcm::FileText& text)
 
 } // namespace
 
-PravFile::PravFile() noexcept : m_nReadPos(0)
-{}
+PravFile::PravFile() noexcept = default;
 
-PravFile::PravFile(const CString& path, UINT flags) : CFile(path, flags), m_nReadPos(0)
+PravFile::PravFile(const CString& path, UINT flags) : CFile(path, flags)
 {
     LoadContent(flags);
 }

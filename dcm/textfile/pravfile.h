@@ -52,5 +52,5 @@ private:
     /// Bytes, as wide text takes four times the memory: a line or block is widened when it is
     /// handed out. Those that have been handed out as a block are used up.
     dcm::FileText m_content;
-    std::int32_t m_nReadPos;
+    std::int32_t m_nReadPos = 0;
 };

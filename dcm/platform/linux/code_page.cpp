@@ -47,6 +47,7 @@ public:
             iconv_close(m_handle);
     }
 
+    // NOLINTNEXTLINE(performance-no-int-to-ptr): how the C library marks a failure.
     bool IsOpen() const { return m_handle != reinterpret_cast<iconv_t>(-1); }
 
     /// Converts all of `text`; what cannot be converted becomes `substitute`, character by
