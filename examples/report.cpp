@@ -267,6 +267,8 @@ std::vector<double> Ticks(const Range& range)
 {
     const double rough = (range.high - range.low) / 5;
     const double power = std::pow(10.0, std::floor(std::log10(rough)));
+    if (!(power > 0))
+        return {range.low, range.high}; // no span to divide
     const double ratio = rough / power;
     const double step = power * (ratio > 5 ? 10 : ratio > 2 ? 5 : ratio > 1 ? 2 : 1);
     const double first = std::ceil(range.low / step);
