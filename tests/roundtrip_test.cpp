@@ -67,7 +67,8 @@ TEST(RoundTrip, SurvivesAFileCutAtEveryByte)
     ASSERT_GT(whole.size(), 2000U);
     WriteBytes(cut, whole);
     std::size_t blocks = 2;
-    for (std::size_t size = whole.size(); size-- > 0;) {
+    for (std::size_t size = whole.size(); size > 0;) {
+        --size;
         std::filesystem::resize_file(PathOf(cut), size);
         DCMConverter document;
         ASSERT_EQ(document.Import(cut), S_OK) << size;
