@@ -87,8 +87,6 @@ HRESULT DCMFestwerteblock::AddValues(std::wstring_view rest)
 {
     if (rest.empty())
         dcm::ThrowResult(E_INVALIDARG);
-    if (rest.starts_with(L'"') && rest.ends_with(L'"'))
-        return AddStringValues(rest);
     bool more = true;
     while (more) {
         double number = 0;
