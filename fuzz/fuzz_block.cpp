@@ -34,14 +34,12 @@ void Check(const CString& text)
         } catch (const dcm::ResultError& error) {
             Require(error.Code() == E_INVALIDARG, "what Init raises");
         }
-        Block copy(block);
-        Block assigned;
+        Block copy(block), assigned;
         assigned.Init(CString(L"KENNFELD a 1 1\n ST/X 1\n ST/Y \"a\"\n WERT 1\n TEXT \"b\"\n"));
         assigned = block;
         const std::string written = Written(block);
-        Require(Written(copy) == written, "a copy is written like the block");
-        Require(Written(assigned) == written, "an assigned block is written like the block");
-        Require(Written(block) == written, "a block is written again as it was");
+        for (Block* same : {&copy, &assigned, &block})
+            Require(Written(*same) == written, "a copy and the block are written alike");
     }
 }
 
@@ -49,19 +47,17 @@ void Check(const CString& text)
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
-    constexpr void (*checks[])(const CString&) = {
-        Check<DCMFestwert>,
-        Check<DCMTextstring>,
-        Check<DCMFestwerteblock>,
-        Check<DCMStuetzstellenverteilung>,
-        Check<DCMKennlinie>,
-        Check<DCMFestkennlinie>,
-        Check<DCMGruppenkennlinie>,
-        Check<DCMKennfeld>,
-        Check<DCMFestkennfeld>,
-        Check<DCMGruppenkennfeld>,
-        Check<DCMKonservierungsFormat>,
-    };
+    constexpr void (*checks[])(const CString&) = {Check<DCMFestwert>,
+                                                  Check<DCMTextstring>,
+                                                  Check<DCMFestwerteblock>,
+                                                  Check<DCMStuetzstellenverteilung>,
+                                                  Check<DCMKennlinie>,
+                                                  Check<DCMFestkennlinie>,
+                                                  Check<DCMGruppenkennlinie>,
+                                                  Check<DCMKennfeld>,
+                                                  Check<DCMFestkennfeld>,
+                                                  Check<DCMGruppenkennfeld>,
+                                                  Check<DCMKonservierungsFormat>};
     if (size == 0)
         return 0;
     const std::size_t kind = *data % std::size(checks);

@@ -3,6 +3,7 @@
 
 #include "dcm/library/dcm.h"
 #include "dcm/platform/text.h"
+#include "fuzz/kinds.h"
 #include "fuzz/memory_file.h"
 #include "fuzz/target.h"
 
@@ -11,6 +12,7 @@
 #include <list>
 #include <string>
 #include <string_view>
+#include <type_traits>
 #include <vector>
 
 namespace {
@@ -86,31 +88,18 @@ bool IsSettled(const DCMKennfeld& block)
            block.GetAxis_YType() != VT_ERROR && block.GetValueType() != VT_ERROR;
 }
 
-template <class Block>
-void Look(const std::list<Block>& blocks, bool& settled, std::vector<std::size_t>& counts)
-{
-    for (const Block& block : blocks)
-        settled = IsSettled(block) && settled;
-    counts.push_back(blocks.size());
-}
-
 /// Looks at every block. Returns whether all are settled, and how many there are of the kinds that
-/// are always written.
+/// are always written: a map with too few values is not.
 bool IsSettled(const DCMConverter& document, std::vector<std::size_t>& counts)
 {
     bool settled = true;
-    Look(document.GetFestwerte(), settled, counts);
-    Look(document.GetFestwerteblock(), settled, counts);
-    Look(document.GetStuetzstellenverteilung(), settled, counts);
-    Look(document.GetKennlinie(), settled, counts);
-    Look(document.GetFestkennlinie(), settled, counts);
-    Look(document.GetGruppenkennlinie(), settled, counts);
-    Look(document.GetTextstring(), settled, counts);
-    // A map with too few values is not written.
-    std::vector<std::size_t> maps;
-    Look(document.GetKennfeld(), settled, maps);
-    Look(document.GetFestkennfeld(), settled, maps);
-    Look(document.GetGruppenkennfeld(), settled, maps);
+    ForEachKind([&](auto get, auto) {
+        const auto blocks = (document.*get)();
+        for (const auto& block : blocks)
+            settled = IsSettled(block) && settled;
+        if constexpr (!std::is_base_of_v<DCMKennfeld, typename decltype(blocks)::value_type>)
+            counts.push_back(blocks.size());
+    });
     return settled;
 }
 

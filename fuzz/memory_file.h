@@ -3,6 +3,9 @@
 #include "dcm/platform/cstring.h"
 
 #include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
 #include <string>
 #include <string_view>
 
@@ -28,17 +31,13 @@ public:
 
     void SetBytes(std::string_view bytes)
     {
-        if (ftruncate(m_file, 0) != 0 ||
-            pwrite(m_file, bytes.data(), bytes.size(), 0) != static_cast<ssize_t>(bytes.size()))
-            std::abort();
+        std::ofstream(std::filesystem::path(m_path), std::ios::binary) << bytes;
     }
 
     std::string Bytes() const
     {
-        std::string bytes(static_cast<std::size_t>(lseek(m_file, 0, SEEK_END)), '\0');
-        if (pread(m_file, bytes.data(), bytes.size(), 0) != static_cast<ssize_t>(bytes.size()))
-            std::abort();
-        return bytes;
+        std::ifstream file(std::filesystem::path(m_path), std::ios::binary);
+        return std::string(std::istreambuf_iterator<char>(file), {});
     }
 
 private:

@@ -2,13 +2,13 @@
 
 #include "dcm/elements/number.h"
 
-#include <algorithm>
 #include <array>
 #include <bit>
 #include <charconv>
 #include <cmath>
 #include <cstddef>
 #include <cstdint>
+#include <iterator>
 #include <limits>
 #include <random>
 #include <string>
@@ -25,28 +25,15 @@ public:
     /// A finite number.
     double Number()
     {
-        double number = 0;
-        switch (Below(6)) {
-        case 0:
-            number = std::bit_cast<double>(m_random());
-            break;
-        case 1: // short decimals
-            number = static_cast<double>(Digits()) / std::pow(10, Below(20));
-            break;
-        case 2: // halves, quarters and on
-            number = std::ldexp(static_cast<double>(Digits()), -Below(64));
-            break;
-        case 3:
-            number = Neighbour(std::ldexp(1.0, Below(2098) - 1074));
-            break;
-        case 4:
-            number = Neighbour(Parse("1e" + std::to_string(Below(632) - 323)));
-            break;
-        default: // denormals
-            number = std::bit_cast<double>(m_random() >> (12 + Below(52)));
-        }
-        number = Below(2) == 0 ? -number : number;
-        return std::isfinite(number) ? number : 0.5;
+        const double numbers[] = {
+            std::bit_cast<double>(m_random()),
+            static_cast<double>(Digits()) / std::pow(10, Below(20)), // short decimals
+            std::ldexp(static_cast<double>(Digits()), -Below(64)),   // halves, quarters and on
+            Neighbour(std::ldexp(1.0, Below(2098) - 1074)),
+            Neighbour(Parse("1e" + std::to_string(Below(632) - 323))),
+            std::bit_cast<double>(m_random() >> (12 + Below(52)))}; // denormals
+        const double number = numbers[Below(6)];
+        return !std::isfinite(number) ? 0.5 : Below(2) == 0 ? -number : number;
     }
 
     /// A text that is a decimal number as a whole.
@@ -60,9 +47,8 @@ public:
         if (kind < 6)
             return {begin, std::to_chars(begin, end, number).ptr};
         if (kind < 12) {
-            constexpr std::chars_format formats[] = {std::chars_format::general,
-                                                     std::chars_format::scientific,
-                                                     std::chars_format::fixed};
+            using enum std::chars_format;
+            constexpr std::chars_format formats[] = {general, scientific, fixed};
             return {begin, std::to_chars(begin, end, number, formats[Below(3)], Below(25)).ptr};
         }
         if (kind == 12) { // half-way between two numbers, or a little above
@@ -105,47 +91,55 @@ private:
     std::mt19937_64 m_random;
 };
 
+/// What is written for a number, with the blank in front.
+inline std::string Text(double number, int digits)
+{
+    std::wstring text(dcm::kNumberTextMax + 1, L'x');
+    const wchar_t* const end = dcm::WriteNumber(number, digits, text.data());
+    if (text.back() != L'x')
+        return "more than its room";
+    return {static_cast<const wchar_t*>(text.data()), end};
+}
+
+/// What is wrong with how `token` is read, alone and with others behind it in its line, where room
+/// lets more be read at once; empty if nothing is.
+inline std::string WrongNumber(const std::wstring& token, double expected)
+{
+    for (const std::wstring_view tail : {L"", L" ", L"   \t 7.25       "}) {
+        const std::wstring line = std::wstring(token).append(tail);
+        std::wstring_view rest = line;
+        double taken = 1;
+        if (dcm::TakeNumber(rest, taken) == tail.empty() ||
+            rest != tail.substr(tail.size() < 2 ? tail.size() : 5))
+            return "what follows the number";
+        const double read = dcm::ReadNumber(std::wstring_view(line).substr(0, token.size()));
+        for (const double number : {read, taken})
+            if (std::bit_cast<std::uint64_t>(number) != std::bit_cast<std::uint64_t>(expected))
+                return std::string(token.begin(), token.end()) + " is " + std::to_string(number);
+    }
+    return {};
+}
+
 /// What is wrong with the text of a finite number by the standard library's measure; empty if
 /// nothing is.
 inline std::string WrongText(double number)
 {
     for (const int digits : {dcm::kFullDigits, dcm::kShortDigits}) {
-        std::array<char, 64> buffer;
-        buffer[0] = ' ';
-        std::string expected(buffer.data(),
-                             std::to_chars(buffer.data() + 1, buffer.data() + buffer.size(), number,
-                                           std::chars_format::general, digits)
-                                 .ptr);
+        char buffer[64] = " ";
+        constexpr auto kGeneral = std::chars_format::general;
+        std::string expected(
+            buffer, std::to_chars(buffer + 1, std::end(buffer), number, kGeneral, digits).ptr);
         const auto letter = expected.find('e');
         if (letter != expected.npos)
             expected.insert(letter + 2, expected.size() - letter == 4 ? 1 : 0, '0');
         else if (expected.find('.') == expected.npos)
             expected += ".0";
-        std::array<wchar_t, dcm::kNumberTextMax + 1> text;
-        text.back() = L'x';
-        const wchar_t* const end = dcm::WriteNumber(number, digits, text.data());
-        if (text.back() != L'x')
-            return expected + " took more than its room";
-        if (!std::equal(static_cast<const wchar_t*>(text.data()), end, expected.begin(),
-                        expected.end()))
-            return "not" + expected + " but" +
-                   std::string(static_cast<const wchar_t*>(text.data()), end);
+        if (const std::string text = Text(number, digits); text != expected)
+            return "not" + expected + " but" + text;
+        if (digits == dcm::kFullDigits)
+            if (auto wrong = WrongNumber({expected.begin() + 1, expected.end()}, number);
+                !wrong.empty())
+                return wrong;
     }
-    return {};
-}
-
-/// The same for a decimal number read from its text, alone and as the first of two in a line.
-inline std::string WrongNumber(const std::string& text)
-{
-    const double expected = NumberSource::Parse(text);
-    const std::wstring line = std::wstring(text.begin(), text.end()) + L"   2.5";
-    std::wstring_view rest = line;
-    double taken = 1;
-    if (!dcm::TakeNumber(rest, taken) || rest != L"2.5")
-        return "the next number behind " + text;
-    const double read = dcm::ReadNumber(std::wstring_view(line).substr(0, text.size()));
-    for (const double number : {read, taken})
-        if (std::bit_cast<std::uint64_t>(number) != std::bit_cast<std::uint64_t>(expected))
-            return text + " is " + std::to_string(number);
     return {};
 }

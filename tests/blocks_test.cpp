@@ -13,9 +13,11 @@ namespace {
 template <class... Rest>
 std::string Fields(const std::string& label, const auto& value, const Rest&... rest)
 {
-    std::string text;
-    if (value != std::decay_t<decltype(value)>())
-        text = " " + label + " " + Show(value);
+    std::string text = value == std::decay_t<decltype(value)>() ? "" : " " + label + " ";
+    if constexpr (std::is_same_v<decltype(value), const std::string&>)
+        text += value;
+    else if (!text.empty())
+        text += Show(value);
     if constexpr (sizeof...(rest) > 0)
         text += Fields(rest...);
     return text;
@@ -25,8 +27,7 @@ std::string Describe(const DCMFestwert& b)
 {
     CComVariant value(L"old");
     EXPECT_EQ(b.GetValue(&value), S_OK);
-    const std::string shown = value.vt == VT_EMPTY ? "" : Show(value);
-    return Fields("unit W", b.GetUnit(), "value", shown);
+    return Fields("unit W", b.GetUnit(), "value", value.vt == VT_EMPTY ? "" : Show(value));
 }
 
 std::string Describe(const DCMFestwerteblock& b)
@@ -101,9 +102,7 @@ const std::map<std::string, void (*)(const Case&)> kChecks = {
 /// Returns how many cases the file has.
 int CheckFile(const std::string& path)
 {
-    std::istringstream lines(
-        Replaced(Replaced(ReadBytes(dcm::Widen(path)), "\xC2\xB7", " "), "\xE2\x86\x92", "\t") +
-        "\n");
+    std::istringstream lines(Unmarked(ReadBytes(dcm::Widen(path))) + "\n");
     std::string title, line;
     Case now;
     int cases = 0;

@@ -34,22 +34,15 @@ struct CodePage
 
 TEST(Text, SharesItsCharactersUntilOneCopyChanges)
 {
-    CString a(L"abc");
-    CString b(a);
-    EXPECT_EQ(Address(a), Address(b));
-    b += L"d";
-    EXPECT_EQ(a, L"abc");
-    a = b;
-    b.Empty();
-    const CString moved(std::move(a));
-    EXPECT_EQ(moved + a + b, L"abcd");
     // Even the keywords' own memory, which no string may write to.
-    CString keyword(dcm::keyword::kWert);
-    const CString other(dcm::keyword::kWert);
-    EXPECT_EQ(Address(keyword), Address(other));
-    keyword += L"E";
-    keyword.Empty();
-    EXPECT_EQ(other, L"WERT");
+    for (const CString& first : {CString(L"WERT"), CString(dcm::keyword::kWert)}) {
+        CString text(first), other(first);
+        EXPECT_EQ(Address(text), Address(first));
+        text += L"E";
+        other.Empty();
+        const CString moved(std::move(text));
+        EXPECT_EQ(first + moved + text + other, L"WERTWERTE");
+    }
 }
 
 TEST(Text, AppendsItselfAndPartsOfItself)
@@ -79,6 +72,9 @@ TEST(Text, ComparesAndRefusesWhatIsOutside)
     EXPECT_THROW(text.GetAt(2), dcm::ResultError);
     EXPECT_THROW(text.Extend(std::numeric_limits<std::size_t>::max()), std::bad_alloc);
     EXPECT_EQ(text, L"ab");
+    EXPECT_STREQ(dcm::ResultError(E_INVALIDARG).what(), "invalid argument");
+    EXPECT_STREQ(dcm::ResultError(DISP_E_BADVARTYPE).what(), "variant of an unknown type");
+    EXPECT_STREQ(dcm::ResultError(E_FAIL).what(), "operation failed");
     const wchar_t* const noText = nullptr;
     const char* const noBytes = nullptr;
     EXPECT_EQ(CString(noText) + L"x" + CString("\xB5") + CString(noBytes), L"x\u00B5");
@@ -117,14 +113,15 @@ TEST(Variant, OwnsWhatItHolds)
 TEST(Variant, RefusesTagsThatItDoesNotKnow)
 {
     VARIANT bad{};
-    bad.vt = 99;
     bad.lVal = 1;
     CComVariant value(L"text");
-    EXPECT_EQ(VariantClear(&bad), DISP_E_BADVARTYPE);
-    EXPECT_EQ(VariantCopy(&bad, &value), DISP_E_BADVARTYPE);
-    EXPECT_EQ(bad.vt, 99);
-    EXPECT_EQ(VariantCopy(&value, &bad), DISP_E_BADVARTYPE);
-    EXPECT_EQ(Show(value), "'text'");
+    for (const int tag : {15, 99}) {
+        bad.vt = static_cast<VARTYPE>(tag);
+        EXPECT_EQ(VariantClear(&bad), DISP_E_BADVARTYPE);
+        EXPECT_EQ(VariantCopy(&bad, &value), DISP_E_BADVARTYPE);
+        EXPECT_EQ(VariantCopy(&value, &bad), DISP_E_BADVARTYPE);
+        EXPECT_EQ(Show(value) + std::to_string(bad.vt), "'text'" + std::to_string(tag));
+    }
     EXPECT_THROW(value = bad, dcm::ResultError);
     EXPECT_EQ(value.vt, VT_ERROR);
     EXPECT_EQ(value.scode, DISP_E_BADVARTYPE);

@@ -60,14 +60,12 @@ TEST(TextFile, OpensAnewWithOrWithoutSuccess)
     PravFile file;
     EXPECT_EQ(Lines(file), "");
     CString line;
-    EXPECT_TRUE(file.Open(folder / L"a", kRead, nullptr));
+    EXPECT_TRUE(file.Open(folder / L"a", kRead));
     EXPECT_EQ(file.ReadLine(line), 1);
     EXPECT_TRUE(file.Open(folder / L"b", kRead));
     EXPECT_EQ(Lines(file), "[b1]");
     EXPECT_TRUE(file.Open(folder / L"a", kRead));
-    CFileException error;
-    EXPECT_FALSE(static_cast<CFile&>(file).Open(folder / L"missing", kRead, &error));
-    EXPECT_EQ(error.m_cause, CFileException::fileNotFound);
+    EXPECT_FALSE(static_cast<CFile&>(file).Open(folder / L"missing", kRead));
     EXPECT_EQ(Lines(file), "");
     EXPECT_THROW(file.WriteText(L"a"), CFileException);
     EXPECT_THROW(PravFile(folder / L"missing", kRead), CFileException);
@@ -76,14 +74,11 @@ TEST(TextFile, OpensAnewWithOrWithoutSuccess)
 TEST(TextFile, ConvertsLongTextWhole)
 {
     const Folder folder;
-    const CString path = folder / L"euros";
     const std::wstring text(1'000'000, L'\u20AC');
     dcm::SetThreadCodePage(65001);
-    PravFile file(path, kCreate);
-    file.WriteText(CString(text) + L"\n");
-    file.Close();
-    EXPECT_EQ(ReadBytes(path).size(), 3 * text.size() + 2);
-    EXPECT_TRUE(file.Open(path, kRead));
+    PravFile(folder / L"euros", kCreate).WriteText(CString(text) + L"\n");
+    EXPECT_EQ(ReadBytes(folder / L"euros").size(), 3 * text.size() + 2);
+    PravFile file(folder / L"euros", kRead);
     dcm::SetThreadCodePage(1252);
     CString line;
     EXPECT_EQ(file.ReadLine(line), 1);

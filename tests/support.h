@@ -11,6 +11,8 @@
 #include <string>
 #include <string_view>
 #include <system_error>
+#include <type_traits>
+#include <utility>
 
 /// How a failed comparison shows a text.
 inline void PrintTo(const CString& text, std::ostream* out)
@@ -75,6 +77,16 @@ inline std::string Replaced(std::string text, std::string_view from, std::string
     return text;
 }
 
+/// What a text in a file of data/ stands for: a middle dot is a blank, an arrow a tab, an arrow
+/// down a vertical tab, a pilcrow a carriage return.
+inline std::string Unmarked(std::string text)
+{
+    for (const auto& [mark, meant] :
+         {std::pair("\u00B7", " "), {"\u2192", "\t"}, {"\u2193", "\v"}, {"\u00B6", "\r"}})
+        text = Replaced(text, mark, meant);
+    return text;
+}
+
 /// `text` in the thread's code page.
 inline std::string Narrow(std::wstring_view text)
 {
@@ -113,31 +125,23 @@ inline std::string Show(const CString& text)
     return "'" + dcm::ToUtf8(text) + "'";
 }
 
-inline std::string Show(int number)
-{
-    return std::to_string(number);
-}
-
-/// What is shown already.
-inline std::string Show(const std::string& text)
-{
-    return text;
-}
-
 /// The shortest text of a number, whatever the locale.
-inline std::string Show(double value)
+template <class Number>
+requires std::is_arithmetic_v<Number>
+inline std::string Show(Number value)
 {
     char text[32];
     return {text, std::to_chars(text, text + sizeof text, value).ptr};
 }
 
-/// A number as it is, a text in single quotes (just "-" when absent), else the tag in brackets.
+/// A number as it is, a text in single quotes (just "-" when absent), else the tag in
+/// brackets, with a mark behind it if there is a value.
 inline std::string Show(const VARIANT& value)
 {
     if (value.vt == VT_R8)
         return Show(value.dblVal);
     if (value.vt != VT_BSTR)
-        return "[" + std::to_string(value.vt) + "]";
+        return "[" + std::to_string(value.vt) + (value.llVal == 0 ? "]" : "]=");
     return value.bstrVal == nullptr ? "-" : Show(CString(CComVariant::TextOf(value)));
 }
 

@@ -1,0 +1,244 @@
+// What a host sets in a block, gets from it and finds written; what a block's text reads as stands
+// in blocks_test.cpp.
+#include "tests/support.h"
+
+#include <gtest/gtest.h>
+
+#include <chrono>
+#include <cstdint>
+#include <limits>
+#include <tuple>
+#include <utility>
+
+using namespace test;
+
+namespace {
+
+/// A variant of this tag whose content is zero.
+VARIANT Tagged(VARTYPE tag)
+{
+    VARIANT variant{};
+    variant.vt = tag;
+    return variant;
+}
+
+std::string ValueOf(const DCMFestwert& block)
+{
+    CComVariant value(L"old");
+    return block.GetValue(&value) == S_OK ? Show(value) : "failed";
+}
+
+std::string AxisX(const DCMKennfeld& map)
+{
+    return Points(map, &DCMKennfeld::GetAxis_X);
+}
+
+/// The text of a FESTWERTEBLOCK without its LANGNAME line and its end.
+template <class Value>
+std::string Lines(std::initializer_list<Value> values, int x, int y)
+{
+    DCMFestwerteblock block;
+    for (const Value& value : values)
+        block.AddValue(value);
+    block.SetXValueCount(x);
+    block.SetYValueCount(y);
+    return Replaced(Replaced(Written(block), "    LANGNAME \"\"\n", ""), "END\n\n", "");
+}
+
+/// A map class of the host's own.
+struct HostMap : DCMKennfeld
+{
+    std::string Parts()
+    {
+        PravFile file;
+        EXPECT_EQ(AddValues(L"1 2", L"WERT"), S_OK);
+        return dcm::ToUtf8(ExportLangname(file) + ExportDisplayname(file) + ExportFunktion(file) +
+                           ExportValues(file));
+    }
+};
+
+} // namespace
+
+TEST(Festwert, WritesAValueOfAnyTag)
+{
+    const std::pair<CComVariant, std::string> cases[] = {
+        {0.1, "WERT 0.10000000000000001"},
+        {CComVariant(), "WERT 0.0"},
+        {L"a\r\nb\t\"c\"\\", "TEXT \"a..b\t\"c\"\\\""},
+        {Tagged(VT_BSTR), "TEXT \"\""},
+        {7, "WERT 7.0"},
+        {4000000000U, "WERT 4000000000.0"},
+        {static_cast<signed char>(-1), "WERT -1.0"},
+        {std::uint8_t{255}, "WERT 255.0"},
+        {std::int16_t{-2}, "WERT -2.0"},
+        {std::uint16_t{65535}, "WERT 65535.0"},
+        {-(std::int64_t{1} << 40), "WERT -1099511627776.0"},
+        {~std::uint64_t{0}, "WERT 1.8446744073709552e+019"},
+        {0.5F, "WERT 0.5"},
+        {true, "WERT 1.0"},
+        {false, "WERT 0.0"}};
+    for (const auto& [value, line] : cases) {
+        DCMTextstring block;
+        block.SetUnit(L" ");
+        EXPECT_EQ(block.SetValue(value), S_OK);
+        EXPECT_EQ(block.GetValueType(), value.vt);
+        EXPECT_EQ(Written(block),
+                  "TEXTSTRING \n    LANGNAME \"\"\n    EINHEIT_W \"\"\n    " + line + "\nEND\n\n");
+        EXPECT_EQ(block.GetUnit(), L"") << "written, a blank is none";
+    }
+}
+
+TEST(Festwert, GivesAndTakesCopiesOfItsValue)
+{
+    DCMFestwert block;
+    EXPECT_EQ(block.GetValue(nullptr), E_POINTER);
+    EXPECT_EQ(block.SetValue(nullptr), E_POINTER);
+    CComVariant text(L"text");
+    EXPECT_EQ(block.SetValue(text), S_OK);
+    text.bstrVal[0] = L'n';
+    const DCMFestwert copy(block);
+    block = *&block;
+    EXPECT_EQ(ValueOf(block), "'text'");
+    EXPECT_EQ(block.SetValue(CComVariant(3)), S_OK);
+    EXPECT_EQ(ValueOf(copy), "'text'");
+    VARIANT bad = Tagged(99);
+    bad.lVal = 1;
+    EXPECT_EQ(block.GetValue(&bad), DISP_E_BADVARTYPE);
+    EXPECT_THROW(block.SetValue(bad), dcm::ResultError);
+    EXPECT_EQ(block.GetValueType(), VT_ERROR);
+}
+
+TEST(Festwerteblock, WritesLinesOfFiveOrRows)
+{
+    const std::string line = "    WERT 0.10000000000000001    10000000000000000.0    "
+                             "0.66666666666666663    1.#INF   \n";
+    const std::tuple<int, int, std::string> numbers[] = {
+        {3, 2, "3 @ 2\n    WERT 0.1    1e+016    0.666666666666667   \n    WERT 1.#INF   \n"},
+        {4, 9, "4 @ 9\n    WERT 0.1    1e+016    0.666666666666667    1.#INF   \n"},
+        {0, 3, "0 @ 3\n" + line},
+        {2, 0, "4\n" + line},
+        {2, -1, "2 @ -1\n" + line}};
+    for (const auto& [x, y, text] : numbers)
+        EXPECT_EQ(Lines({0.1, 1e16, 2.0 / 3, std::numeric_limits<double>::infinity()}, x, y),
+                  "FESTWERTEBLOCK  " + text);
+    const std::tuple<int, int, std::string> texts[] = {
+        {0, 0, "4\n    TEXT \"a\"    \"b..c\t\"    \"d\"e\"    \"\"   \n"},
+        {3, 1, "3 @ 1\n    TEXT \"a\"    \"b..c\t\"    \"d\"e\"   \n    TEXT \"\"   \n"}};
+    for (const auto& [x, y, text] : texts)
+        EXPECT_EQ(Lines({L"a", L"b\r\nc\t", L"d\"e", L""}, x, y), "FESTWERTEBLOCK  " + text);
+}
+
+TEST(Festwerteblock, ReadsListsOfQuotesInLinearTime)
+{
+    const auto start = std::chrono::steady_clock::now();
+    for (const wchar_t* piece : {L"\"\" ", L"\"a", L"\\\"", L"\" \"", L" \"\"x"}) {
+        CString line(L"TEXT x");
+        while (line.GetLength() < 500'000)
+            line += piece;
+        DCMFestwerteblock().Init(line + L"\n");
+    }
+    // Quadratic time would take minutes.
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(20));
+}
+
+TEST(Points, KeepOneType)
+{
+    const std::string item = "    ST/X 1.0   \n";
+    const std::tuple<std::vector<CComVariant>, std::string, VARTYPE, std::string> cases[] = {
+        {{1.0, L"a", 2.0}, "1 [10] [10]", VT_ERROR, "3" + item},
+        {{L"a\r\n\t\bz\v", Tagged(VT_BSTR), L"", L"\"q"},
+         "'a\r\n\t\bz\v' - '' '\"q'",
+         VT_BSTR,
+         "4    ST_TX/X \"a....z\v\"  \"\"  \"\"  \"\"q\" \n"},
+        {{0.5F, 0.25F}, "[4]= [4]=", VT_R4, "2"},
+        {{1, 2}, "[3] [3]", VT_I4, "2"},
+        {{Tagged(13)}, "[13]", 13, "1"},
+        {{CComVariant(), 1.0, 1}, "[0] 1 [10]", VT_ERROR, "3" + item}};
+    for (const auto& [added, points, type, written] : cases) {
+        DCMStuetzstellenverteilung block;
+        for (const CComVariant& point : added)
+            EXPECT_EQ(block.AddValue(point), S_OK);
+        EXPECT_EQ(Points(block, &DCMStuetzstellenverteilung::GetValues), points);
+        EXPECT_EQ(block.GetValueType(), type);
+        const std::string text = Replaced(Written(block), "\n*SST\n    LANGNAME \"\"\n", "");
+        EXPECT_EQ(text, "STUETZSTELLENVERTEILUNG  " + written + "END\n\n");
+    }
+}
+
+TEST(Points, HaveTextsOfTheirOwnInEachCopy)
+{
+    std::vector<CComVariant> points;
+    {
+        DCMKennfeld map;
+        map.AddAxisX(CComVariant(L"axis"));
+        const DCMKennfeld copy(map);
+        copy.GetAxis_X(points);
+        points[0].bstrVal[0] = L'A';
+        EXPECT_EQ(AxisX(map) + AxisX(copy), "'axis''axis'");
+    }
+    EXPECT_EQ(ShowAll(points), "'Axis'") << "it outlives the block";
+}
+
+TEST(Curve, KeepsTwoStoresAndTwoNames)
+{
+    DCMGruppenkennlinie curve;
+    curve.Init(L"GRUPPENKENNLINIE K 0\n*SSTX Load\nST/X 0\nTEXT \"a\"\nEINHEIT_X x\n");
+    EXPECT_EQ(curve.GetAxisType() + curve.GetValueType(), VT_R8 + VT_BSTR);
+    // The host's own numbers are no part of the block, and their keywords know only one spelling.
+    for (const wchar_t* keyword : {L"ST/X", L"WERT", L"st/x", L"Wert", L"TEXT"})
+        curve.AddValue(8.0, keyword);
+    EXPECT_EQ(ShowAll(curve.GetAxis()) + " " + ShowAll(curve.GetValues()), "8 8");
+    curve.AddAxis(CComVariant(1.0));
+    curve.AddValue(CComVariant(1.0));
+    curve.SetUnit_X(L" ");
+    curve.SetUnit_W(L" ");
+    curve.SetAxisLenghtX(9);
+    // A copy of the base's type keeps keyword, units and lists.
+    DCMKennlinie copy;
+    copy = curve;
+    copy.SetSharedAxisUniqueName(L"Speed");
+    const std::string head = "GRUPPENKENNLINIE K 9\n    LANGNAME \"\"\n    EINHEIT_X \"\"\n"
+                             "    EINHEIT_W \"\"\n";
+    const std::string body = "    ST/X 0.0    1.0   \n    TEXT \"a\" \nEND\n\n";
+    EXPECT_EQ(Written(curve), head + body);
+    EXPECT_EQ(Written(DCMKennlinie(copy)), head + "*SSTX Speed\n" + body);
+    EXPECT_EQ(curve.GetUnit_X() + curve.GetUnit_W(), L"");
+    EXPECT_EQ(copy.GetUnit_X() + copy.GetUnit_W(), L"  ");
+    EXPECT_EQ(copy.GetStuetzstellenverteilung(), L"Load");
+    EXPECT_EQ(ShowAll(copy.GetAxis()), "8");
+}
+
+TEST(Map, WritesWhatTheHostSets)
+{
+    DCMFestkennfeld map;
+    map.SetName(L"F");
+    map.AddAxisX(CComVariant(L"a\n\t\r\b"));
+    map.AddAxisY(CComVariant(2.0));
+    map.AddAxisY(CComVariant(1));
+    for (const CComVariant& value : {CComVariant(1.0), CComVariant(2.0), CComVariant(3)})
+        map.AddValue(value);
+    EXPECT_EQ(map.GetAxis_XType(), VT_BSTR);
+    EXPECT_EQ(map.GetAxis_YType() + map.GetValueType(), VT_ERROR + VT_ERROR);
+    map.SetUnit_X(L" ");
+    map.SetUnit_Y(L"\u00B0");
+    map.SetUnit_W(L" ");
+    map.SetSharedXAxisUniqueName(L"A");
+    map.SetSharedYAxisUniqueName(L"B");
+    map.SetAxisLenghtX(8);
+    map.SetAxisLenghtY(6);
+    map.RotateMap();
+    EXPECT_EQ(Written(map), "FESTKENNFELD F 8 6\n    LANGNAME \"\"\n    EINHEIT_X \"\"\n"
+                            "    EINHEIT_Y \"\xB0\"\n    EINHEIT_W \"\"\n*SSTX A\n*SSTY B\n"
+                            "    ST_TX/X \"a....\" \n    ST/Y 2.0   \n    WERT 1.0   \n"
+                            "    WERT 2.0   \nEND\n\n");
+    EXPECT_EQ(map.GetUnit_X() + map.GetUnit_Y() + map.GetUnit_W(), L"\u00B0");
+    EXPECT_EQ(map.GetStuetzstellenverteilungX() + map.GetStuetzstellenverteilungY(), L"");
+}
+
+TEST(Map, GivesItsPartsToAClassOfTheHost)
+{
+    HostMap map;
+    map.Init(L"KENNFELD n 2 1\nLANGNAME l\nDISPLAYNAME d\nFUNKTION f\nST/X 1 2\nST/Y 1\n");
+    EXPECT_EQ(map.Parts(), "    LANGNAME \"l\"\n    DISPLAYNAME \"d\"\n    FUNKTION f\n"
+                           "    ST/X 1.0    2.0   \n    ST/Y 1.0   \n    WERT 1.0    2.0   \n");
+}
