@@ -148,6 +148,7 @@ TEST(Allocation, FailureIsRaisedByTheOtherCalls)
          [](State& s) {
              DCMKennfeld block;
              block.AddAxisX(s.value);
+             block.AddAxisY(CComVariant(L"text"));
              block.AddValue(s.value);
              DCMStuetzstellenverteilung().AddValue(s.value);
              DCMFestwerteblock().AddValue(L"text");

@@ -243,4 +243,7 @@ TEST(HostileFile, IsReadOrRefused)
         EXPECT_EQ(document.Import(path), S_OK);
         EXPECT_EQ(document.GetFestwerte().size(), blocks) << bytes.substr(0, 10);
     }
+    // Its low 32 bits are those of an empty file.
+    std::filesystem::resize_file(PathOf(path), 1ULL << 34);
+    EXPECT_EQ(DCMConverter().Import(path), kFailed);
 }
