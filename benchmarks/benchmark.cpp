@@ -60,7 +60,6 @@ void SetUp(Stage& stage, const std::filesystem::path& folder, Flavour flavour, d
         stage.someTexts.append(stage.someTexts.empty() ? 0 : 3, ' ');
         AppendNumber(stage.someTexts, number, flavour);
     }
-    stage.someWideTexts.assign(stage.someTexts.begin(), stage.someTexts.end());
 }
 
 /// A contestant that does something else than the others is worth nothing: all who read have to

@@ -29,7 +29,6 @@ struct Stage
     /// line of these texts with three blanks between them.
     std::vector<double> someNumbers;
     std::string someTexts;
-    std::wstring someWideTexts;
     std::filesystem::path dcmFile;
     std::filesystem::path jsonFile;
     std::filesystem::path outputFile;

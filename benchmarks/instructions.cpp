@@ -42,16 +42,16 @@ void WriteNumbers(const std::vector<double>& numbers)
 
 void ReadTokens(const std::vector<double>& numbers)
 {
-    std::wstring line;
+    std::string line;
     for (const double number : numbers) {
         std::array<wchar_t, dcm::kNumberTextMax> text;
         line.append(line.empty() ? 0 : 2, L' ');
         line.append(text.data(), dcm::WriteNumber(number, 17, text.data()));
     }
     Counted([&] {
-        std::wstring_view rest = line;
+        dcm::NumberReader reader(line);
         double number = 0;
-        while (dcm::TakeNumber(rest, number)) {
+        while (reader.Next(number)) {
         }
     });
 }

@@ -85,11 +85,11 @@ const TakesPart kNumberToken("token/dcm", [](const Stage& stage) {
     Outcome outcome;
     Timed(outcome.seconds, [&] {
         for (std::size_t i = Repetitions(stage); i > 0; --i) {
-            std::wstring_view rest = stage.someWideTexts;
+            NumberReader numbers(stage.someTexts);
             bool more = true;
             while (more) {
                 double number = 0;
-                more = TakeNumber(rest, number);
+                more = numbers.Next(number);
                 benchmark::DoNotOptimize(number);
             }
         }

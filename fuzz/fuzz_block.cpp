@@ -62,8 +62,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         return 0;
     const std::size_t kind = *data % std::size(checks);
     CString text;
-    dcm::AppendWide(text, {reinterpret_cast<const char*>(data + 1), size - 1},
-                    dcm::Encoding::kUtf8);
+    dcm::AppendWide(text,
+                    {{reinterpret_cast<const char*>(data + 1), size - 1}, dcm::Encoding::kUtf8});
     checks[kind](text);
     return 0;
 }

@@ -25,34 +25,29 @@ double ReferenceNumber(std::string token)
 
 void CheckReading(const std::string& text)
 {
-    // Beyond ASCII the characters become others that are no digits either.
-    std::wstring wide(text.size(), L'\0');
-    std::transform(text.begin(), text.end(), wide.begin(), [](char c) {
-        return static_cast<wchar_t>(static_cast<unsigned char>(c) < 0x80 ? c : 0x660 + (c & 0x7F));
-    });
-    std::wstring_view rest = wide;
+    dcm::NumberReader numbers(text);
     bool more = true;
     while (more) {
-        const std::size_t start = wide.size() - rest.size();
+        const std::size_t start = text.size() - numbers.Rest().size();
         const std::size_t blank = std::min(text.find(' ', start), text.size());
         const std::string token = text.substr(start, blank - start);
         const double expected = ReferenceNumber(token);
         double taken = 1;
-        more = dcm::TakeNumber(rest, taken);
-        const std::string wrong = WrongNumber(wide.substr(start, token.size()), expected);
+        more = numbers.Next(taken);
+        const std::string wrong = WrongNumber(token, expected);
         Require(wrong.empty(), wrong.c_str());
         Require(std::bit_cast<std::uint64_t>(taken) == std::bit_cast<std::uint64_t>(expected),
                 "the number taken");
         Require(more == (blank < text.size()), "another number follows");
         const std::size_t next =
             std::min(text.find_first_not_of(" \t\n\v\f\r", blank), text.size());
-        Require(wide.size() - rest.size() == next, "where the next number begins");
+        Require(text.size() - numbers.Rest().size() == next, "where the next number begins");
     }
     // The C library saturates at 64 bits, far beyond the limits of 32.
     const long long integer = std::strtoll(text.c_str(), nullptr, 10);
     const auto expected = std::clamp<long long>(integer, std::numeric_limits<std::int32_t>::min(),
                                                 std::numeric_limits<std::int32_t>::max());
-    Require(dcm::ReadInteger(wide) == expected, "the integer read");
+    Require(dcm::ReadInteger(text) == expected, "the integer read");
 }
 
 } // namespace

@@ -103,19 +103,19 @@ inline std::string Text(double number, int digits)
 
 /// What is wrong with how `token` is read, alone and with others behind it in its line, where room
 /// lets more be read at once; empty if nothing is.
-inline std::string WrongNumber(const std::wstring& token, double expected)
+inline std::string WrongNumber(const std::string& token, double expected)
 {
-    for (const std::wstring_view tail : {L"", L" ", L"   \t 7.25       "}) {
-        const std::wstring line = std::wstring(token).append(tail);
-        std::wstring_view rest = line;
+    for (const std::string_view tail : {"", " ", "   \t 7.25       "}) {
+        const std::string line = std::string(token).append(tail);
+        dcm::NumberReader numbers(line);
         double taken = 1;
-        if (dcm::TakeNumber(rest, taken) == tail.empty() ||
-            rest != tail.substr(tail.size() < 2 ? tail.size() : 5))
+        if (numbers.Next(taken) == tail.empty() ||
+            numbers.Rest() != tail.substr(tail.size() < 2 ? tail.size() : 5))
             return "what follows the number";
-        const double read = dcm::ReadNumber(std::wstring_view(line).substr(0, token.size()));
+        const double read = dcm::ReadNumber(token);
         for (const double number : {read, taken})
             if (std::bit_cast<std::uint64_t>(number) != std::bit_cast<std::uint64_t>(expected))
-                return std::string(token.begin(), token.end()) + " is " + std::to_string(number);
+                return token + " is " + std::to_string(number);
     }
     return {};
 }

@@ -242,3 +242,22 @@ TEST(Map, GivesItsPartsToAClassOfTheHost)
     EXPECT_EQ(map.Parts(), "    LANGNAME \"l\"\n    DISPLAYNAME \"d\"\n    FUNKTION f\n"
                            "    ST/X 1.0    2.0   \n    ST/Y 1.0   \n    WERT 1.0    2.0   \n");
 }
+
+TEST(Map, KeepsEveryCharacterOfTheHost)
+{
+    // Characters of one to four bytes, halves of pairs, and numbers that no character has.
+    CString name(L"m\u00E4\u20AC\u0131");
+    for (const std::uint32_t c : {0x1F600U, 0xD800U, 0xDFFFU, 0xFFFFU, 0x7FFFFFFFU, 0xFFFFFFFFU}) {
+        const auto wide = static_cast<wchar_t>(c);
+        name += std::wstring_view(&wide, 1);
+    }
+    DCMKennfeld map;
+    map.Init(L"KENNFELD " + name + L" 2 1\nEINHEIT_X " + name + L"\nST/X 1\u0131 \u0662\n");
+    EXPECT_EQ(map.GetName(), name);
+    EXPECT_EQ(map.GetUnit_X(), name);
+    std::vector<CComVariant> axis;
+    map.GetAxis_X(axis);
+    ASSERT_EQ(axis.size(), 2U);
+    EXPECT_EQ(axis[0].dblVal, 1);
+    EXPECT_EQ(axis[1].dblVal, 0);
+}

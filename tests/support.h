@@ -90,7 +90,7 @@ inline std::string Unmarked(std::string text)
 /// `text` in the thread's code page.
 inline std::string Narrow(std::wstring_view text)
 {
-    return std::string(dcm::ToThreadCodePage(dcm::FileTextFromWide(text)).View());
+    return std::string(dcm::ToThreadCodePage(dcm::FileTextFromWide(text)).Bytes());
 }
 
 /// What a block writes, with single line feeds. `block` is changed as its export changes it.

@@ -14,7 +14,7 @@
 struct DCMConverter::BlockKind
 {
     std::wstring_view keyword;
-    HRESULT (DCMConverter::*insert)(const CString& strBlock);
+    HRESULT (DCMConverter::*insert)(dcm::FileTextView block);
     HRESULT (DCMConverter::*write)(PravFile& file) const;
 };
 
@@ -40,7 +40,7 @@ const DCMConverter::BlockKind DCMConverter::kBlockKinds[] = {
 
 namespace {
 
-constexpr std::wstring_view kCommentMark = L"* ";
+constexpr std::string_view kCommentMark = "* ";
 
 } // namespace
 
@@ -60,7 +60,7 @@ HRESULT DCMConverter::Import(const CString& strPath)
         PravFile file(strPath, CFile::modeRead);
         m_bBlockSeen = 0;
         HRESULT result = S_OK;
-        CString block;
+        dcm::FileTextView block;
         while (file.ReadBlock(block))
             result = AnalyzeToken(block);
         return result;
@@ -70,37 +70,36 @@ HRESULT DCMConverter::Import(const CString& strPath)
 }
 
 /// Takes what is in front of the first blank, wherever that stands, as the keyword of the block.
-HRESULT DCMConverter::AnalyzeToken(const CString& strBlock)
+HRESULT DCMConverter::AnalyzeToken(dcm::FileTextView block)
 {
-    const std::wstring_view block = strBlock;
-    const std::size_t blank = block.find(L' ');
-    if (blank == block.npos)
+    const std::size_t blank = block.bytes.find(' ');
+    if (blank == block.bytes.npos)
         return S_OK;
-    const std::wstring_view keyword = block.substr(0, blank);
+    const std::string_view keyword = block.bytes.substr(0, blank);
     const auto* const kind =
         std::find_if(std::begin(kBlockKinds), std::end(kBlockKinds),
                      [&](const BlockKind& k) { return dcm::EqualsNoCase(keyword, k.keyword); });
     if (kind != std::end(kBlockKinds)) {
         // A block that its parser rejects is dropped, but it ends the comment like any other.
-        (this->*kind->insert)(strBlock);
+        (this->*kind->insert)(block);
         m_bBlockSeen = 1;
     } else if (dcm::EqualsNoCase(keyword, dcm::keyword::kKonservierungFormat)) {
-        InsertKonservierungsFormat(strBlock);
+        InsertKonservierungsFormat(block);
         m_bBlockSeen = 1;
-    } else if (keyword == dcm::keyword::kComment && m_bBlockSeen == 0) {
-        InsertKommentar(strBlock);
+    } else if (dcm::EqualsNoCase(keyword, dcm::keyword::kComment) && m_bBlockSeen == 0) {
+        InsertKommentar(block);
     }
     return S_OK;
 }
 
 /// Removes the marks in one pass, so that a mark which forms anew stays.
-HRESULT DCMConverter::InsertKommentar(const CString& strBlock)
+HRESULT DCMConverter::InsertKommentar(dcm::FileTextView block)
 {
     CString comment;
-    std::wstring_view rest = strBlock;
+    std::string_view rest = block.bytes;
     for (;;) {
         const std::size_t mark = rest.find(kCommentMark);
-        comment += rest.substr(0, mark);
+        dcm::AppendWide(comment, {rest.substr(0, mark), block.encoding});
         if (mark == rest.npos)
             break;
         rest.remove_prefix(mark + kCommentMark.size());
@@ -110,70 +109,70 @@ HRESULT DCMConverter::InsertKommentar(const CString& strBlock)
 }
 
 /// The version that a file declares changes nothing in the document.
-HRESULT DCMConverter::InsertKonservierungsFormat(const CString&)
+HRESULT DCMConverter::InsertKonservierungsFormat(dcm::FileTextView)
 {
     return S_OK;
 }
 
 /// Parses a new block and stores it unless the parser rejects it.
 template <class Block>
-HRESULT DCMConverter::InsertBlock(std::list<Block>& blocks, const CString& strBlock)
+HRESULT DCMConverter::InsertBlock(std::list<Block>& blocks, dcm::FileTextView block)
 {
     std::list<Block> fresh(1);
-    const HRESULT result = fresh.front().Init(strBlock);
+    const HRESULT result = fresh.front().ReadBlock(block);
     if (SUCCEEDED(result))
         blocks.splice(blocks.end(), fresh);
     return result;
 }
 
-HRESULT DCMConverter::InsertFestwert(const CString& strBlock)
+HRESULT DCMConverter::InsertFestwert(dcm::FileTextView block)
 {
-    return InsertBlock(m_listFestwerte, strBlock);
+    return InsertBlock(m_listFestwerte, block);
 }
 
-HRESULT DCMConverter::InsertFestwerteBlock(const CString& strBlock)
+HRESULT DCMConverter::InsertFestwerteBlock(dcm::FileTextView block)
 {
-    return InsertBlock(m_listFestwerteblock, strBlock);
+    return InsertBlock(m_listFestwerteblock, block);
 }
 
-HRESULT DCMConverter::InsertStuetzstellenverteilung(const CString& strBlock)
+HRESULT DCMConverter::InsertStuetzstellenverteilung(dcm::FileTextView block)
 {
-    return InsertBlock(m_listStuetzstellenverteilung, strBlock);
+    return InsertBlock(m_listStuetzstellenverteilung, block);
 }
 
-HRESULT DCMConverter::InsertKennlinie(const CString& strBlock)
+HRESULT DCMConverter::InsertKennlinie(dcm::FileTextView block)
 {
-    return InsertBlock(m_listKennlinie, strBlock);
+    return InsertBlock(m_listKennlinie, block);
 }
 
-HRESULT DCMConverter::InsertFestKennlinie(const CString& strBlock)
+HRESULT DCMConverter::InsertFestKennlinie(dcm::FileTextView block)
 {
-    return InsertBlock(m_listFestkennlinie, strBlock);
+    return InsertBlock(m_listFestkennlinie, block);
 }
 
-HRESULT DCMConverter::InsertGruppenKennlinie(const CString& strBlock)
+HRESULT DCMConverter::InsertGruppenKennlinie(dcm::FileTextView block)
 {
-    return InsertBlock(m_listGruppenkennlinie, strBlock);
+    return InsertBlock(m_listGruppenkennlinie, block);
 }
 
-HRESULT DCMConverter::InsertKennfeld(const CString& strBlock)
+HRESULT DCMConverter::InsertKennfeld(dcm::FileTextView block)
 {
-    return InsertBlock(m_listKennfeld, strBlock);
+    return InsertBlock(m_listKennfeld, block);
 }
 
-HRESULT DCMConverter::InsertFestKennfeld(const CString& strBlock)
+HRESULT DCMConverter::InsertFestKennfeld(dcm::FileTextView block)
 {
-    return InsertBlock(m_listFestkennfeld, strBlock);
+    return InsertBlock(m_listFestkennfeld, block);
 }
 
-HRESULT DCMConverter::InsertGruppenKennfeld(const CString& strBlock)
+HRESULT DCMConverter::InsertGruppenKennfeld(dcm::FileTextView block)
 {
-    return InsertBlock(m_listGruppenkennfeld, strBlock);
+    return InsertBlock(m_listGruppenkennfeld, block);
 }
 
-HRESULT DCMConverter::InsertTextstring(const CString& strBlock)
+HRESULT DCMConverter::InsertTextstring(dcm::FileTextView block)
 {
-    return InsertBlock(m_listTextstring, strBlock);
+    return InsertBlock(m_listTextstring, block);
 }
 
 HRESULT DCMConverter::AddFestwert(const DCMFestwert& block)

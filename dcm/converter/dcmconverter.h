@@ -87,19 +87,19 @@ private:
     struct BlockKind;
     static const BlockKind kBlockKinds[];
 
-    HRESULT AnalyzeToken(const CString& strBlock);
-    HRESULT InsertKommentar(const CString& strBlock);
-    HRESULT InsertKonservierungsFormat(const CString& strBlock);
-    HRESULT InsertFestwert(const CString& strBlock);
-    HRESULT InsertFestwerteBlock(const CString& strBlock);
-    HRESULT InsertStuetzstellenverteilung(const CString& strBlock);
-    HRESULT InsertKennlinie(const CString& strBlock);
-    HRESULT InsertFestKennlinie(const CString& strBlock);
-    HRESULT InsertGruppenKennlinie(const CString& strBlock);
-    HRESULT InsertKennfeld(const CString& strBlock);
-    HRESULT InsertFestKennfeld(const CString& strBlock);
-    HRESULT InsertGruppenKennfeld(const CString& strBlock);
-    HRESULT InsertTextstring(const CString& strBlock);
+    HRESULT AnalyzeToken(dcm::FileTextView block);
+    HRESULT InsertKommentar(dcm::FileTextView block);
+    HRESULT InsertKonservierungsFormat(dcm::FileTextView block);
+    HRESULT InsertFestwert(dcm::FileTextView block);
+    HRESULT InsertFestwerteBlock(dcm::FileTextView block);
+    HRESULT InsertStuetzstellenverteilung(dcm::FileTextView block);
+    HRESULT InsertKennlinie(dcm::FileTextView block);
+    HRESULT InsertFestKennlinie(dcm::FileTextView block);
+    HRESULT InsertGruppenKennlinie(dcm::FileTextView block);
+    HRESULT InsertKennfeld(dcm::FileTextView block);
+    HRESULT InsertFestKennfeld(dcm::FileTextView block);
+    HRESULT InsertGruppenKennfeld(dcm::FileTextView block);
+    HRESULT InsertTextstring(dcm::FileTextView block);
 
     HRESULT WriteHeader(PravFile& file) const;
     HRESULT WriteFormat(PravFile& file) const;
@@ -115,7 +115,7 @@ private:
     HRESULT WriteTextstring(PravFile& file) const;
 
     template <class Block>
-    static HRESULT InsertBlock(std::list<Block>& blocks, const CString& strBlock);
+    static HRESULT InsertBlock(std::list<Block>& blocks, dcm::FileTextView block);
     template <class Block>
     static HRESULT WriteBlocks(const std::list<Block>& blocks, PravFile& file);
 

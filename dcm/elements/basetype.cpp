@@ -36,15 +36,15 @@ void DCMBaseType::AppendAttributes(CString& block) const
     AppendFunktion(block);
 }
 
-bool DCMBaseType::ReadAttribute(std::wstring_view keyword, std::wstring_view value,
-                                std::wstring_view function)
+bool DCMBaseType::ReadAttribute(std::string_view keyword, dcm::FileTextView value,
+                                dcm::FileTextView function)
 {
     if (dcm::EqualsNoCase(keyword, dcm::keyword::kLangname))
-        m_strLangname = value;
+        m_strLangname = value.Wide();
     else if (dcm::EqualsNoCase(keyword, dcm::keyword::kDisplayname))
-        m_strDisplayname = value;
+        m_strDisplayname = value.Wide();
     else if (dcm::EqualsNoCase(keyword, dcm::keyword::kFunktion))
-        m_strFunction = function;
+        m_strFunction = function.Wide();
     else
         return false;
     return true;

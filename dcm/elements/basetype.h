@@ -1,6 +1,7 @@
 #pragma once
 
 #include "dcm/library/export.h"
+#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 
 #include <string_view>
@@ -53,8 +54,8 @@ protected:
 
     /// Stores `value` when `keyword` is that of LANGNAME or DISPLAYNAME, `function` when it is
     /// that of FUNKTION; otherwise returns false.
-    bool ReadAttribute(std::wstring_view keyword, std::wstring_view value,
-                       std::wstring_view function);
+    bool ReadAttribute(std::string_view keyword, dcm::FileTextView value,
+                       dcm::FileTextView function);
 
 private:
     void AppendLangname(CString& block) const;

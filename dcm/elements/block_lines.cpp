@@ -4,38 +4,41 @@
 
 namespace dcm {
 
-BlockLines::BlockLines(std::wstring_view block)
-    : m_left(block.starts_with(L'\n') ? std::wstring_view() : block)
-{}
+BlockLines::BlockLines(FileTextView block) : m_left(block)
+{
+    if (block.bytes.starts_with('\n'))
+        m_left.bytes = {};
+}
 
 bool BlockLines::Next(BlockLine& line)
 {
+    auto& [left, encoding] = m_left;
     for (;;) {
-        const std::size_t end = m_left.find(L'\n');
-        if (end == m_left.npos)
+        const std::size_t end = left.find('\n');
+        if (end == left.npos)
             return false;
-        const std::wstring_view text = TrimLeft({m_left.data(), end}, IsWhite);
-        m_left.remove_prefix(end + 1);
-        const wchar_t* const last = text.data() + text.size();
+        const std::string_view text = TrimLeft(left.substr(0, end), IsWhite);
+        left.remove_prefix(end + 1);
+        const char* const last = text.data() + text.size();
         // Keywords are short: the blank behind one is near.
-        const wchar_t* const blank = std::find(text.data(), last, L' ');
+        const char* const blank = std::find(text.data(), last, ' ');
         if (blank != last) {
-            line = {{text.data(), blank}, {blank + 1, last}};
+            line = {{text.data(), blank}, {{blank + 1, last}, encoding}};
             return true;
         }
     }
 }
 
-std::wstring_view TakeName(std::wstring_view& rest)
+FileTextView TakeName(FileTextView& rest)
 {
-    const std::wstring_view text = rest;
-    const std::size_t blank = text.find(L' ');
+    const std::string_view text = rest.bytes;
+    const std::size_t blank = text.find(' ');
     if (blank == text.npos) {
-        rest = TrimWhite(text);
-        return {};
+        rest = TrimWhite(rest);
+        return {{}, rest.encoding};
     }
-    rest = TrimWhite(text.substr(blank));
-    return TrimRight(text.substr(0, blank), IsWhite);
+    rest.bytes = TrimWhite(text.substr(blank));
+    return {TrimRight(text.substr(0, blank), IsWhite), rest.encoding};
 }
 
 } // namespace dcm

@@ -1,17 +1,38 @@
 #pragma once
 
+#include "dcm/platform/codepage.h"
 #include "dcm/platform/text.h"
 
 #include <string_view>
 
-/// Reading the text of one block.
+/// Reading the text of one block, as the bytes that it has in its file.
 namespace dcm {
+
+inline FileTextView TrimWhite(FileTextView text)
+{
+    return {TrimWhite(text.bytes), text.encoding};
+}
+
+inline FileTextView TrimBlanks(FileTextView text)
+{
+    return {TrimBlanks(text.bytes), text.encoding};
+}
+
+inline FileTextView TrimQuotes(FileTextView text)
+{
+    return {TrimQuotes(text.bytes), text.encoding};
+}
+
+inline FileTextView TrimBlanksAndQuotes(FileTextView text)
+{
+    return {TrimBlanksAndQuotes(text.bytes), text.encoding};
+}
 
 /// One line of a block: its keyword, and all that follows the first blank behind it.
 struct BlockLine
 {
-    std::wstring_view keyword;
-    std::wstring_view rest;
+    std::string_view keyword;
+    FileTextView rest;
 
     bool Is(std::wstring_view other) const { return EqualsNoCase(keyword, other); }
 };
@@ -22,18 +43,18 @@ struct BlockLine
 class BlockLines
 {
 public:
-    explicit BlockLines(std::wstring_view block);
+    explicit BlockLines(FileTextView block);
 
     /// Takes the next such line. False at the end.
     bool Next(BlockLine& line);
 
 private:
-    std::wstring_view m_left;
+    FileTextView m_left;
 };
 
 /// Takes the name, the text before the first blank, off `rest`, which keeps what follows without
 /// white space at its ends. Without a blank there is no name and `rest` keeps all of it. White
 /// space in front is the caller's matter.
-std::wstring_view TakeName(std::wstring_view& rest);
+FileTextView TakeName(FileTextView& rest);
 
 } // namespace dcm

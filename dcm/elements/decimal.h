@@ -4,6 +4,7 @@
 #include <bit>
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 
 // The fast conversions between doubles, decimal digits and characters.
 //
@@ -148,33 +149,23 @@ constexpr std::uint64_t EightTimes(unsigned char value)
     return value * std::uint64_t{0x0101'0101'0101'0101};
 }
 
-/// Four characters in the bytes of a word, the first in the lowest. Adds the bits of all of them
-/// to `all`: beyond U+007F they do not fit their bytes.
-inline std::uint64_t PackFour(const wchar_t* at, std::uint64_t& all)
+/// The eight characters at `at` in the bytes of a word, the first in the lowest: 0 to 9 for digits.
+inline std::uint64_t DigitBytes(const unsigned char* at)
 {
-    const auto pair = [](const wchar_t* two) {
-        return static_cast<std::uint32_t>(two[0]) |
-               std::uint64_t{static_cast<std::uint32_t>(two[1])} << 32;
-    };
-    const auto first = pair(at);
-    const auto second = pair(at + 2);
-    all |= first | second;
-    const auto mixed = first | second << 16; // 0 and 2 in the lower half, 1 and 3 in the upper
-    return (mixed | mixed >> 24) & 0xFFFF'FFFF;
-}
-
-/// The eight characters at `at` as bytes, 0 to 9 for digits and others below 0x80 for the rest, the
-/// first in the lowest byte; no digits at all if a character is beyond U+007F.
-inline std::uint64_t DigitBytes(const wchar_t* at)
-{
-    std::uint64_t all = 0;
-    const auto text = PackFour(at, all) | PackFour(at + 4, all) << 32;
-    const bool ascii = (all & 0xFFFF'FF80'FFFF'FF80) == 0;
-    return ascii ? text ^ EightTimes('0') : EightTimes(0x7F);
+    std::uint64_t text = 0;
+    if constexpr (std::endian::native == std::endian::little) {
+        std::memcpy(&text, at, sizeof text);
+    } else {
+        for (int i = 0; i < 8; ++i) {
+            text |= std::uint64_t{at[i]} << (8 * i);
+        }
+    }
+    return text ^ EightTimes('0');
 }
 
 /// Bits in the upper half of each byte that is not a digit, none in those that are: only 10 to 15
-/// need the added 6 to reach the upper half.
+/// need the added 6 to reach the upper half. Behind a byte from 0xFA on, into which the sum
+/// carries, digits may have them too.
 constexpr std::uint64_t NotDigits(std::uint64_t bytes)
 {
     return (bytes | (bytes + EightTimes(6))) & EightTimes(0xF0);

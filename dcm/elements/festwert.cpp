@@ -70,19 +70,24 @@ DCMFestwert::~DCMFestwert() = default;
 
 HRESULT DCMFestwert::Init(const CString& strBlock)
 {
-    dcm::BlockLines lines(strBlock);
+    return ReadBlock(dcm::FileTextOfHost(strBlock).View());
+}
+
+HRESULT DCMFestwert::ReadBlock(dcm::FileTextView block)
+{
+    dcm::BlockLines lines(block);
     dcm::BlockLine line;
     while (lines.Next(line)) {
-        const std::wstring_view text = dcm::TrimQuotes(dcm::TrimWhite(line.rest));
-        const std::wstring_view rest = dcm::TrimBlanks(text);
+        const dcm::FileTextView text = dcm::TrimQuotes(dcm::TrimWhite(line.rest));
+        const dcm::FileTextView rest = dcm::TrimBlanks(text);
         if (line.Is(m_strKeyword))
-            SetName(rest);
+            SetName(rest.Wide());
         else if (ReadAttribute(line.keyword, rest, rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnit = rest;
+            m_strUnit = rest.Wide();
         else if (line.Is(dcm::keyword::kWert))
-            m_value = dcm::ReadNumber(rest);
+            m_value = dcm::ReadNumber(rest.bytes);
         else if (line.Is(dcm::keyword::kText))
             ReadText(text);
     }
@@ -90,14 +95,14 @@ HRESULT DCMFestwert::Init(const CString& strBlock)
 }
 
 /// Truth words are numbers; in these letters only.
-void DCMFestwert::ReadText(std::wstring_view text)
+void DCMFestwert::ReadText(dcm::FileTextView text)
 {
-    if (text == L"true")
+    if (text.bytes == "true")
         m_value = 1.0;
-    else if (text == L"false")
+    else if (text.bytes == "false")
         m_value = 0.0;
     else
-        m_value.SetText(dcm::TrimQuotes(dcm::TrimWhite(text)));
+        m_value.SetText(dcm::TrimQuotes(dcm::TrimWhite(text)).Wide());
 }
 
 HRESULT DCMFestwert::Export(PravFile& file)

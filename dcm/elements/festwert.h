@@ -3,6 +3,7 @@
 #include "dcm/elements/basetype.h"
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
+#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
 
@@ -59,7 +60,9 @@ protected:
 
 private:
     friend class DCMConverter;
-    void ReadText(std::wstring_view text);
+    void ReadText(dcm::FileTextView text);
+    /// Init for the text of a file.
+    HRESULT ReadBlock(dcm::FileTextView block);
     /// Composes the block in `block`, which is empty before.
     void ComposeBlock(CString& block) const;
 

@@ -9,33 +9,39 @@
 #include "dcm/textfile/pravfile.h"
 
 #include <algorithm>
+#include <string>
 #include <utility>
 
 namespace {
 
 constexpr dcm::TextItemStyle kBlockText = {L"\n\r", L"   "};
 
+bool IsQuoted(std::string_view text)
+{
+    return text.starts_with('"') && text.ends_with('"');
+}
+
 /// Where the quote that ends the text at the start of `rest` stands: one with a blank or nothing
 /// behind it, that neither begins the text nor follows a backslash. Any other belongs to the text.
-std::size_t FindClosingQuote(std::wstring_view rest)
+std::size_t FindClosingQuote(std::string_view rest)
 {
-    std::size_t at = rest.find(L'"');
+    std::size_t at = rest.find('"');
     while (at != rest.npos) {
         const bool last = at + 1 == rest.size();
-        if (at > 0 && rest[at - 1] != L'\\' && (last || rest[at + 1] == L' '))
+        if (at > 0 && rest[at - 1] != '\\' && (last || rest[at + 1] == ' '))
             return at;
-        at = rest.find(L'"', at + 1);
+        at = rest.find('"', at + 1);
     }
     return rest.npos;
 }
 
 /// Whether `rest`, which follows a pair of quotes, goes on with blanks and an opening quote, so
 /// that the pair is an empty text.
-bool AnotherTextFollows(std::wstring_view rest)
+bool AnotherTextFollows(std::string_view rest)
 {
-    const std::size_t next = rest.find_first_not_of(L' ');
-    return next != 0 && next != rest.npos && rest[next] == L'"' && next + 1 < rest.size() &&
-           rest[next + 1] != L' ';
+    const std::size_t next = rest.find_first_not_of(' ');
+    return next != 0 && next != rest.npos && rest[next] == '"' && next + 1 < rest.size() &&
+           rest[next + 1] != ' ';
 }
 
 } // namespace
@@ -52,17 +58,22 @@ DCMFestwerteblock::~DCMFestwerteblock() = default;
 
 HRESULT DCMFestwerteblock::Init(const CString& strBlock)
 {
-    dcm::BlockLines lines(strBlock);
+    return ReadBlock(dcm::FileTextOfHost(strBlock).View());
+}
+
+HRESULT DCMFestwerteblock::ReadBlock(dcm::FileTextView block)
+{
+    dcm::BlockLines lines(block);
     dcm::BlockLine line;
     while (lines.Next(line)) {
         // White space first, then blanks and quotes, for every line of the block.
-        const std::wstring_view rest = dcm::TrimBlanksAndQuotes(dcm::TrimWhite(line.rest));
+        const dcm::FileTextView rest = dcm::TrimBlanksAndQuotes(dcm::TrimWhite(line.rest));
         if (line.Is(dcm::keyword::kFestwerteblock))
             ReadFirstLine(rest);
         else if (ReadAttribute(line.keyword, rest, rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnit = rest;
+            m_strUnit = rest.Wide();
         else if (line.Is(dcm::keyword::kWert))
             AddValues(rest);
         else if (line.Is(dcm::keyword::kText))
@@ -72,62 +83,66 @@ HRESULT DCMFestwerteblock::Init(const CString& strBlock)
 }
 
 /// The name and, for rows, "X @ Y" behind it. The count of a list is not needed.
-void DCMFestwerteblock::ReadFirstLine(std::wstring_view rest)
+void DCMFestwerteblock::ReadFirstLine(dcm::FileTextView rest)
 {
-    SetName(dcm::TakeName(rest));
-    const std::size_t at = rest.find(L'@');
-    if (at == rest.npos || at == 0)
+    SetName(dcm::TakeName(rest).Wide());
+    const std::string_view counts = rest.bytes;
+    const std::size_t at = counts.find('@');
+    if (at == counts.npos || at == 0)
         return;
     // A blank stands on either side of the "@".
-    m_nXValueCount = dcm::ReadInteger(rest.substr(0, at - 1));
-    m_nYValueCount = dcm::ReadInteger(rest.size() > at + 2 ? rest.substr(at + 2) : L"");
+    m_nXValueCount = dcm::ReadInteger(counts.substr(0, at - 1));
+    m_nYValueCount = dcm::ReadInteger(counts.size() > at + 2 ? counts.substr(at + 2) : "");
 }
 
-HRESULT DCMFestwerteblock::AddValues(std::wstring_view rest)
+HRESULT DCMFestwerteblock::AddValues(dcm::FileTextView rest)
 {
-    if (rest.empty())
+    if (rest.bytes.empty())
         dcm::ThrowResult(E_INVALIDARG);
+    dcm::NumberReader numbers(rest.bytes);
     bool more = true;
     while (more) {
         double number = 0;
-        more = dcm::TakeNumber(rest, number);
+        more = numbers.Next(number);
         m_vecDoubleValues.push_back(number);
     }
     return S_OK;
 }
 
 /// A line of texts. Without quotes around all of it, the whole line is one text.
-HRESULT DCMFestwerteblock::AddTexts(std::wstring_view rest)
+HRESULT DCMFestwerteblock::AddTexts(dcm::FileTextView rest)
 {
     rest = dcm::TrimWhite(rest);
-    if (rest.starts_with(L'"') && rest.ends_with(L'"'))
+    if (IsQuoted(rest.bytes))
         return AddStringValues(rest);
-    CString quoted(L"\"");
-    quoted.Append(rest).Append(L"\"");
-    return AddStringValues(quoted);
+    const std::string quoted = '"' + std::string(rest.bytes) + '"';
+    return AddStringValues({quoted, rest.encoding});
 }
 
-HRESULT DCMFestwerteblock::AddStringValues(std::wstring_view rest)
+HRESULT DCMFestwerteblock::AddStringValues(dcm::FileTextView line)
 {
+    std::string_view rest = line.bytes;
+    const auto add = [&](std::string_view text) {
+        m_listStringValues.push_back(dcm::FileTextView{text, line.encoding}.Wide());
+    };
     while (!rest.empty()) {
-        const std::size_t quotes = std::min(rest.find_first_not_of(L'"'), rest.size());
+        const std::size_t quotes = std::min(rest.find_first_not_of('"'), rest.size());
         rest.remove_prefix(quotes);
         if (rest.empty())
             break;
         if (quotes > 1 && AnotherTextFollows(rest)) {
-            m_listStringValues.emplace_back();
+            add({});
         } else {
             const std::size_t end = FindClosingQuote(rest);
             if (end == rest.npos) {
                 // Nothing closes the text: it runs to the end, but for a final quote.
-                m_listStringValues.emplace_back(
-                    rest.substr(0, rest.size() - (rest.ends_with(L'"') ? 1 : 0)));
+                add(rest.substr(0, rest.size() - (rest.ends_with('"') ? 1 : 0)));
                 break;
             }
-            m_listStringValues.emplace_back(rest.substr(0, end));
+            add(rest.substr(0, end));
             rest.remove_prefix(end + 1);
         }
-        rest.remove_prefix(std::min(rest.find_first_not_of(L' '), rest.size()));
+        rest.remove_prefix(std::min(rest.find_first_not_of(' '), rest.size()));
     }
     return S_OK;
 }

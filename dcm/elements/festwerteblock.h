@@ -3,6 +3,7 @@
 #include "dcm/elements/basetype.h"
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
+#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 
 #include <cstdint>
@@ -66,10 +67,12 @@ public:
 
 private:
     friend class DCMConverter;
-    void ReadFirstLine(std::wstring_view rest);
-    HRESULT AddValues(std::wstring_view rest);
-    HRESULT AddTexts(std::wstring_view rest);
-    HRESULT AddStringValues(std::wstring_view rest);
+    void ReadFirstLine(dcm::FileTextView rest);
+    HRESULT AddValues(dcm::FileTextView rest);
+    HRESULT AddTexts(dcm::FileTextView rest);
+    HRESULT AddStringValues(dcm::FileTextView line);
+    /// Init for the text of a file.
+    HRESULT ReadBlock(dcm::FileTextView block);
     /// Composes the block in `block`, which is empty before.
     void ComposeBlock(CString& block) const;
     void ExportValues(CString& block) const;

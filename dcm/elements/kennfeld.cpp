@@ -25,37 +25,42 @@ DCMKennfeld::~DCMKennfeld() = default;
 
 HRESULT DCMKennfeld::Init(const CString& strBlock)
 {
-    dcm::BlockLines lines(strBlock);
+    return ReadBlock(dcm::FileTextOfHost(strBlock).View());
+}
+
+HRESULT DCMKennfeld::ReadBlock(dcm::FileTextView block)
+{
+    dcm::BlockLines lines(block);
     dcm::BlockLine line;
     while (lines.Next(line)) {
         // Most lines of a file are lines of points.
         if (TakePointLine(line.keyword, line.rest))
             continue;
         if (line.Is(m_strKeyword))
-            ReadFirstLine(dcm::TrimWhite(line.rest), strBlock);
+            ReadFirstLine(dcm::TrimWhite(line.rest), block);
         else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnitX = dcm::TrimBlanksAndQuotes(line.rest);
+            m_strUnitX = dcm::TrimBlanksAndQuotes(line.rest).Wide();
         else if (line.Is(dcm::keyword::kEinheitY))
-            m_strUnitY = dcm::TrimBlanksAndQuotes(line.rest);
+            m_strUnitY = dcm::TrimBlanksAndQuotes(line.rest).Wide();
         else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnitW = dcm::TrimBlanksAndQuotes(line.rest);
+            m_strUnitW = dcm::TrimBlanksAndQuotes(line.rest).Wide();
         else if (line.Is(dcm::keyword::kSstX))
-            m_strStuetzstellenverteilungX = dcm::TrimBlanks(line.rest);
+            m_strStuetzstellenverteilungX = dcm::TrimBlanks(line.rest).Wide();
         else if (line.Is(dcm::keyword::kSstY))
-            m_strStuetzstellenverteilungY = dcm::TrimBlanks(line.rest);
+            m_strStuetzstellenverteilungY = dcm::TrimBlanks(line.rest).Wide();
     }
     return S_OK;
 }
 
 /// The name, the count of the X axis and that of the Y axis. Where a word is missing, it is the
 /// one in front.
-void DCMKennfeld::ReadFirstLine(std::wstring_view rest, std::wstring_view block)
+void DCMKennfeld::ReadFirstLine(dcm::FileTextView rest, dcm::FileTextView block)
 {
-    SetName(dcm::TakeName(rest));
-    m_nAxisLengthX = dcm::ReadInteger(dcm::TakeName(rest));
-    m_nAxisLengthY = dcm::ReadInteger(rest);
+    SetName(dcm::TakeName(rest).Wide());
+    m_nAxisLengthX = dcm::ReadInteger(dcm::TakeName(rest).bytes);
+    m_nAxisLengthY = dcm::ReadInteger(rest.bytes);
     dcm::ReservePoints(m_vecAxisX, m_nAxisLengthX, block);
     dcm::ReservePoints(m_vecAxisY, m_nAxisLengthY, block);
     dcm::ReservePoints(m_vecValues, std::int64_t{m_nAxisLengthX} * m_nAxisLengthY, block);
@@ -63,12 +68,13 @@ void DCMKennfeld::ReadFirstLine(std::wstring_view rest, std::wstring_view block)
 
 HRESULT DCMKennfeld::AddValues(std::wstring_view rest, std::wstring_view keyword)
 {
-    TakePointLine(keyword, rest);
+    const dcm::FileText points = dcm::FileTextOfHost(rest);
+    TakePointLine(dcm::FileTextOfHost(keyword).Bytes(), points.View());
     return S_OK;
 }
 
 /// Reads a line of points or values; false for any other line.
-bool DCMKennfeld::TakePointLine(std::wstring_view keyword, std::wstring_view rest)
+bool DCMKennfeld::TakePointLine(std::string_view keyword, dcm::FileTextView rest)
 {
     const dcm::PointTarget targets[] = {
         {dcm::kValues, {m_vecValues, m_vtValueType}},

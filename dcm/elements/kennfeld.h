@@ -3,6 +3,7 @@
 #include "dcm/elements/basetype.h"
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
+#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
 
@@ -103,8 +104,10 @@ protected:
 
 private:
     friend class DCMConverter;
-    void ReadFirstLine(std::wstring_view rest, std::wstring_view block);
-    bool TakePointLine(std::wstring_view keyword, std::wstring_view rest);
+    void ReadFirstLine(dcm::FileTextView rest, dcm::FileTextView block);
+    bool TakePointLine(std::string_view keyword, dcm::FileTextView rest);
+    /// Init for the text of a file.
+    HRESULT ReadBlock(dcm::FileTextView block);
     /// Composes the block in `block`, which is empty before.
     void ComposeBlock(CString& block) const;
     void AppendValues(CString& block) const;

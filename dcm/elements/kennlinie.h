@@ -3,6 +3,7 @@
 #include "dcm/elements/basetype.h"
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
+#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
 
@@ -88,8 +89,10 @@ public:
 
 private:
     friend class DCMConverter;
-    void ReadFirstLine(std::wstring_view rest, std::wstring_view block);
-    bool AddValues(std::wstring_view rest, std::wstring_view keyword);
+    void ReadFirstLine(dcm::FileTextView rest, dcm::FileTextView block);
+    bool AddValues(dcm::FileTextView rest, std::string_view keyword);
+    /// Init for the text of a file.
+    HRESULT ReadBlock(dcm::FileTextView block);
     /// Composes the block in `block`, which is empty before.
     void ComposeBlock(CString& block) const;
     void ExportValues(CString& block) const;

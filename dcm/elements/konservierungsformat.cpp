@@ -14,8 +14,9 @@ DCMKonservierungsFormat::~DCMKonservierungsFormat() = default;
 
 HRESULT DCMKonservierungsFormat::Init(const CString& strBlock)
 {
-    const std::wstring_view text = strBlock;
-    const std::size_t blank = text.find(L' ');
+    const dcm::FileText block = dcm::FileTextOfHost(strBlock);
+    const std::string_view text = block.Bytes();
+    const std::size_t blank = text.find(' ');
     if (blank == text.npos)
         return S_OK;
     if (dcm::EqualsNoCase(text.substr(0, blank), dcm::keyword::kKonservierungFormat))

@@ -22,16 +22,16 @@ using namespace std::string_view_literals;
 /// The lowest decimal exponent in fixed notation.
 constexpr int kFixedMin = -4;
 
-constexpr bool IsDigit(wchar_t c)
+constexpr bool IsDigit(char c)
 {
-    return c >= L'0' && c <= L'9';
+    return c >= '0' && c <= '9';
 }
 
 /// Takes a sign off the front of `text`; returns whether it was a minus sign.
-bool TakeSign(std::wstring_view& text)
+bool TakeSign(std::string_view& text)
 {
-    const bool negative = text.starts_with(L'-');
-    if (negative || text.starts_with(L'+')) {
+    const bool negative = text.starts_with('-');
+    if (negative || text.starts_with('+')) {
         text.remove_prefix(1);
     }
     return negative;
@@ -78,15 +78,15 @@ wchar_t* WriteExponent(int exponent, wchar_t* to)
 class ExactDecimal
 {
 public:
-    void Append(wchar_t digit, bool behindPoint)
+    void Append(char digit, bool behindPoint)
     {
-        if (m_count == 0 && digit == L'0') {
+        if (m_count == 0 && digit == '0') {
             m_exponent -= behindPoint ? 1 : 0;
         } else if (m_count < kDigitsMax) {
-            m_text[m_count++] = static_cast<char>(digit);
+            m_text[m_count++] = digit;
             m_exponent -= behindPoint ? 1 : 0;
         } else {
-            m_more = m_more || digit != L'0';
+            m_more = m_more || digit != '0';
             m_exponent += behindPoint ? 0 : 1;
         }
     }
@@ -131,9 +131,9 @@ private:
 };
 
 /// The exponent at the start of `text`, "e" included; 0 when there is none.
-std::int64_t Exponent(std::wstring_view text)
+std::int64_t Exponent(std::string_view text)
 {
-    if (!text.starts_with(L'e') && !text.starts_with(L'E')) {
+    if (!text.starts_with('e') && !text.starts_with('E')) {
         return 0;
     }
     text.remove_prefix(1);
@@ -142,60 +142,56 @@ std::int64_t Exponent(std::wstring_view text)
     for (std::size_t i = 0; i < text.size() && IsDigit(text[i]); ++i) {
         // More than any count of digits can make up for, and far from overflow.
         constexpr std::int64_t enough = 100'000'000'000'000'000;
-        exponent = std::min(exponent * 10 + (text[i] - L'0'), enough);
+        exponent = std::min(exponent * 10 + (text[i] - '0'), enough);
     }
     return negative ? -exponent : exponent;
 }
 
 /// ReadNumber for tokens of every kind and length.
-double ReadToken(std::wstring_view token) noexcept
+double ReadToken(std::string_view token) noexcept
 {
     constexpr double infinity = std::numeric_limits<double>::infinity();
     if (EqualsNoCase(token, kInfinityName)) {
         return infinity;
     }
-    if (token.starts_with(L'-') && EqualsNoCase(token.substr(1), kInfinityName)) {
+    if (token.starts_with('-') && EqualsNoCase(token.substr(1), kInfinityName)) {
         return -infinity;
     }
     return ReadDecimal(token);
 }
 
-/// TakeNumber for tokens of every kind.
-[[gnu::noinline]] bool TakeAnyNumber(std::wstring_view& rest, double& value)
+/// Appends the digits at `at` to `number`, up to eight at a time; returns their end.
+inline const unsigned char* TakeDigits(const unsigned char* at, std::uint64_t& number)
 {
-    const auto blank = rest.find(L' ');
-    value = ReadToken(rest.substr(0, blank));
-    rest.remove_prefix(std::min(blank, rest.size()));
-    rest = TrimLeft(rest, IsWhite);
-    return blank != rest.npos;
-}
-
-/// Appends the digits at `at` to `number`, one by one; returns their end.
-inline const wchar_t* TakeDigits(const wchar_t* at, const wchar_t* end, std::uint64_t& number)
-{
-    for (; at != end && IsDigit(*at); ++at) {
-        number = number * 10 + static_cast<std::uint64_t>(*at - L'0');
+    constexpr std::uint64_t tens[] = {1, 10, 100, 1'000, 10'000, 100'000, 1'000'000, 10'000'000};
+    for (;;) {
+        const auto bytes = DigitBytes(at);
+        const auto others = NotDigits(bytes);
+        if (others != 0) {
+            // No branch on the count, which changes from number to number.
+            const int size = std::countr_zero(others) & 56;
+            number = number * tens[size / 8] + JoinEight(bytes << 8 << (56 - size));
+            return at + size / 8;
+        }
+        number = number * kTenTo8 + JoinEight(bytes);
+        at += 8;
     }
-    return at;
 }
 
 /// Takes the digits at `at` and a point among them; returns their end, or a null pointer when there
 /// is no digit. More than 19 digits overflow.
-inline const wchar_t* TakeFixed(const wchar_t* at, const wchar_t* end, Decimal& decimal)
+inline const unsigned char* TakeFixed(const unsigned char* at, Decimal& decimal)
 {
-    const auto bytes = end - at >= 8 ? DigitBytes(at) : 0;
+    const auto bytes = DigitBytes(at);
     const auto others = NotDigits(bytes);
     if (others == 0) {
-        const auto* const start = at;
-        at = TakeDigits(at, end, decimal.digits);
-        const bool found = at != start;
-        if (at == end || *at != L'.') {
-            return found ? at : nullptr;
+        at = TakeDigits(at, decimal.digits);
+        if (*at == '.') {
+            const auto* const fraction = at + 1;
+            at = TakeDigits(fraction, decimal.digits);
+            decimal.exponent = static_cast<int>(fraction - at);
         }
-        const auto* const fraction = at + 1;
-        at = TakeDigits(fraction, end, decimal.digits);
-        decimal.exponent = static_cast<int>(fraction - at);
-        return found || at != fraction ? at : nullptr;
+        return at;
     }
     // The digits in front of the first other character, those behind it if that is the point, and
     // where they end or, after seven, the word does. All positions are in bits.
@@ -215,32 +211,25 @@ inline const wchar_t* TakeFixed(const wchar_t* at, const wchar_t* end, Decimal& 
         return at;
     }
     const auto* const more = at;
-    if (end - at >= 8) {
-        const auto next = DigitBytes(at);
-        if (NotDigits(next) == 0) {
-            decimal.digits = decimal.digits * kTenTo8 + JoinEight(next);
-            at += 8;
-        }
-    }
-    at = TakeDigits(at, end, decimal.digits);
+    at = TakeDigits(at, decimal.digits);
     decimal.exponent -= static_cast<int>(at - more);
     return at;
 }
 
 /// Adds the exponent at `at`, "e" included, to `exponent` and returns its end; `at` itself when
 /// there is none of one to four digits.
-const wchar_t* TakeExponent(const wchar_t* at, const wchar_t* end, int& exponent)
+const unsigned char* TakeExponent(const unsigned char* at, int& exponent)
 {
     const auto* next = at;
-    if (*next != L'e' && *next != L'E') {
+    if (*next != 'e' && *next != 'E') {
         return at;
     }
     ++next;
-    const bool negative = next != end && *next == L'-';
-    next += negative || (next != end && *next == L'+') ? 1 : 0;
+    const bool negative = *next == '-';
+    next += negative || *next == '+' ? 1 : 0;
     std::uint64_t size = 0;
-    const auto* const last = TakeDigits(next, std::min(next + 4, end), size);
-    if (last == next) {
+    const auto* const last = TakeDigits(next, size);
+    if (last == next || last > next + 4) {
         return at;
     }
     exponent += negative ? -static_cast<int>(size) : static_cast<int>(size);
@@ -249,27 +238,27 @@ const wchar_t* TakeExponent(const wchar_t* at, const wchar_t* end, int& exponent
 
 /// Reads the decimal number at `at` in the forms that files are full of, and returns its end; a
 /// null pointer for all that ReadToken must see.
-inline const wchar_t* TakeDecimal(const wchar_t* at, const wchar_t* end, double& value)
+inline const unsigned char* TakeDecimal(const unsigned char* at, double& value)
 {
-    const std::uint64_t negative = at != end && *at == L'-' ? 1 : 0;
+    const std::uint64_t negative = *at == '-' ? 1 : 0;
     at += negative;
     const auto* start = at;
     Decimal decimal;
-    at = TakeFixed(at, end, decimal);
+    at = TakeFixed(at, decimal);
     if (at == nullptr) {
         return nullptr;
     }
     constexpr std::ptrdiff_t most = 19;
     if (at - start > most) {
-        while (start != at && (*start == L'0' || *start == L'.')) {
+        while (*start == '0' || *start == '.') {
             ++start;
         }
         if (at - start > most) {
             return nullptr;
         }
     }
-    if (at != end && *at != L' ') {
-        at = TakeExponent(at, end, decimal.exponent);
+    if (*at != ' ') {
+        at = TakeExponent(at, decimal.exponent);
     }
     if (!ToDouble(decimal, value)) {
         return nullptr;
@@ -323,9 +312,9 @@ wchar_t* WriteNumber(double value, int digits, wchar_t* to) noexcept
     return to + std::max(count, exponent + 2) + (exponent < 0 ? 0 : 1);
 }
 
-double ReadDecimal(std::wstring_view text) noexcept
+double ReadDecimal(std::string_view text) noexcept
 {
-    std::wstring_view token = TrimLeft(text, IsWhite);
+    std::string_view token = TrimLeft(text, IsWhite);
     const bool negative = TakeSign(token);
     ExactDecimal decimal;
     bool point = false;
@@ -333,7 +322,7 @@ double ReadDecimal(std::wstring_view text) noexcept
     for (; i < token.size(); ++i) {
         if (IsDigit(token[i])) {
             decimal.Append(token[i], point);
-        } else if (token[i] == L'.' && !point) {
+        } else if (token[i] == '.' && !point) {
             point = true;
         } else {
             break;
@@ -347,39 +336,77 @@ double ReadDecimal(std::wstring_view text) noexcept
     return negative ? -value : value;
 }
 
-double ReadNumber(std::wstring_view token) noexcept
+double ReadNumber(std::string_view token) noexcept
 {
-    auto rest = token;
     double value = 0.0;
-    return TakeNumber(rest, value) ? ReadToken(token) : value;
+    return NumberReader(token).Next(value) ? ReadToken(token) : value;
 }
 
-bool TakeNumber(std::wstring_view& rest, double& value) noexcept
+bool NumberReader::Next(double& value) noexcept
 {
-    const auto* const end = rest.data() + rest.size();
-    const auto* at = TakeDecimal(rest.data(), end, value);
-    if (at == nullptr || (at != end && *at != L' ')) {
-        return TakeAnyNumber(rest, value);
+    if (m_at > m_last) {
+        Load(Rest());
     }
-    const bool more = at != end;
-    while (at != end && *at == L' ') {
+    const auto* at = TakeDecimal(m_at, value);
+    if (at == nullptr || (*at != ' ' && (at != m_end || m_last != m_end))) {
+        return NextOfAnyKind(value);
+    }
+    const bool more = *at == ' ';
+    while (*at == ' ') {
         ++at;
     }
-    rest = {at, static_cast<std::size_t>(end - at)};
-    if (at != end && *at < L' ') {
-        rest = TrimLeft(rest, IsWhite);
+    m_at = at;
+    if (*at < ' ') {
+        SkipWhite();
     }
     return more;
 }
 
-std::int32_t ReadInteger(std::wstring_view text) noexcept
+/// Next for tokens of every kind and length.
+bool NumberReader::NextOfAnyKind(double& value)
+{
+    const auto rest = Rest();
+    const auto blank = rest.find(' ');
+    value = ReadToken(rest.substr(0, blank));
+    Skip(std::min(blank, rest.size()));
+    SkipWhite();
+    return blank != rest.npos;
+}
+
+void NumberReader::SkipWhite()
+{
+    const auto rest = Rest();
+    Skip(rest.size() - TrimLeft(rest, IsWhite).size());
+}
+
+void NumberReader::Skip(std::size_t count)
+{
+    if (count <= static_cast<std::size_t>(m_end - m_at)) {
+        m_at += count;
+    } else {
+        Load(Rest().substr(count));
+    }
+}
+
+void NumberReader::Load(std::string_view text)
+{
+    m_text = text;
+    const auto size = std::min(text.size(), kPiece);
+    std::memcpy(m_piece.data(), text.data(), size);
+    std::memset(m_piece.data() + size, 0, kBehind);
+    m_at = m_piece.data();
+    m_end = m_at + size;
+    m_last = size == text.size() ? m_end : m_end - kLongest;
+}
+
+std::int32_t ReadInteger(std::string_view text) noexcept
 {
     text = TrimLeft(text, IsWhite);
     const bool negative = TakeSign(text);
     constexpr std::int64_t limit = std::int64_t{1} << 31;
     std::int64_t value = 0;
     for (std::size_t i = 0; i < text.size() && IsDigit(text[i]); ++i) {
-        value = std::min(value * 10 + (text[i] - L'0'), limit);
+        value = std::min(value * 10 + (text[i] - '0'), limit);
     }
     return static_cast<std::int32_t>(negative ? -value : std::min(value, limit - 1));
 }

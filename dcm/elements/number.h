@@ -1,5 +1,6 @@
 #pragma once
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <string_view>
@@ -23,19 +24,50 @@ wchar_t* WriteNumber(double value, int digits, wchar_t* to) noexcept;
 /// The number at the start of `text`, behind white space: its longest prefix that is a decimal
 /// number, rounded to nearest, ties to even; too large a number is infinity. Without a number +0.0,
 /// also behind a sign.
-double ReadDecimal(std::wstring_view text) noexcept;
+double ReadDecimal(std::string_view text) noexcept;
 
 /// The value of a whole token: infinity for "1.#Inf" and "-1.#Inf" in letters of either case, else
 /// what ReadDecimal reads.
-double ReadNumber(std::wstring_view token) noexcept;
+double ReadNumber(std::string_view token) noexcept;
 
-/// Reads the token in front of the first blank of `rest` (all of it without a blank) as ReadNumber
-/// does, then removes it, that blank and the white space behind it from `rest`. Returns whether a
-/// blank ended the token, so that another token follows.
-bool TakeNumber(std::wstring_view& rest, double& value) noexcept;
+/// Reads numbers one after the other from text in which blanks part them.
+class NumberReader
+{
+public:
+    explicit NumberReader(std::string_view text) noexcept { Load(text); }
+
+    /// Reads the token in front of the next blank (all that is left, without a blank) as ReadNumber
+    /// does, then skips that blank and the white space behind it. Returns whether a blank ended the
+    /// token, so that another token follows.
+    bool Next(double& value) noexcept;
+
+    /// The text that is left.
+    std::string_view Rest() const noexcept { return m_text.substr(Position()); }
+
+private:
+    /// Characters that are looked at together, and the most that a number takes which is read the
+    /// fast way.
+    static constexpr std::size_t kPiece = 512;
+    static constexpr std::size_t kLongest = 64;
+    static constexpr std::size_t kBehind = 8;
+
+    std::size_t Position() const { return static_cast<std::size_t>(m_at - m_piece.data()); }
+    void Load(std::string_view text);
+    void Skip(std::size_t count);
+    void SkipWhite();
+    bool NextOfAnyKind(double& value);
+
+    /// A piece of `m_text`, from its start on, and zeros: digits are looked at eight at a time.
+    std::array<unsigned char, kPiece + kBehind> m_piece;
+    std::string_view m_text;
+    const unsigned char* m_at;
+    /// Where the piece ends, and behind which position a number may reach beyond that.
+    const unsigned char* m_end;
+    const unsigned char* m_last;
+};
 
 /// The decimal integer at the start of `text`: white space, a sign, digits; what follows is
 /// ignored. Saturates at the limits of 32 bits; 0 without digits.
-std::int32_t ReadInteger(std::wstring_view text) noexcept;
+std::int32_t ReadInteger(std::string_view text) noexcept;
 
 } // namespace dcm

@@ -1,5 +1,6 @@
 #include "dcm/elements/points.h"
 
+#include "dcm/elements/block_lines.h"
 #include "dcm/elements/number.h"
 #include "dcm/platform/text.h"
 
@@ -25,12 +26,13 @@ bool KeepsValue(VARTYPE type)
     return type == VT_R8 || type == VT_R4 || type == VT_BSTR;
 }
 
-void ReadNumbers(std::wstring_view rest, const PointArray& array)
+void ReadNumbers(std::string_view rest, const PointArray& array)
 {
+    NumberReader numbers(rest);
     bool more = !rest.empty();
     while (more) {
         double number = 0;
-        more = TakeNumber(rest, number);
+        more = numbers.Next(number);
         if (array.type == VT_R8)
             array.points.emplace_back(number);
         else
@@ -40,14 +42,15 @@ void ReadNumbers(std::wstring_view rest, const PointArray& array)
 
 /// A text begins behind an opening quote, which is whatever follows the text before it, and ends at
 /// the next quote or with the line.
-void ReadTexts(std::wstring_view rest, const PointArray& array)
+void ReadTexts(FileTextView line, const PointArray& array)
 {
+    std::string_view rest = line.bytes;
     while (!rest.empty()) {
         rest.remove_prefix(1);
-        const std::size_t end = rest.find(L'"');
-        const std::wstring_view text = rest.substr(0, end);
-        rest = end == rest.npos ? std::wstring_view() : TrimWhite(rest.substr(end + 1));
-        AppendPoint(array, CComVariant(text));
+        const std::size_t end = rest.find('"');
+        const FileTextView text = {rest.substr(0, end), line.encoding};
+        rest = end == rest.npos ? std::string_view() : TrimWhite(rest.substr(end + 1));
+        AppendPoint(array, CComVariant(text.Wide()));
     }
 }
 
@@ -74,27 +77,27 @@ void AppendPoint(const PointArray& array, CComVariant&& point)
     array.type = type;
 }
 
-void ReservePoints(std::vector<CComVariant>& points, long long count, std::wstring_view block)
+void ReservePoints(std::vector<CComVariant>& points, long long count, FileTextView block)
 {
     // The shortest item is a digit and a blank. An array in use grows by itself: room made time
     // and again would copy it each time.
-    const auto most = static_cast<long long>(block.size() / 2);
+    const auto most = static_cast<long long>(block.bytes.size() / 2);
     if (points.empty() && count > 0)
         points.reserve(static_cast<std::size_t>(std::min(count, most)));
 }
 
-void ReadPoints(std::wstring_view rest, const PointArray* numbers, const PointArray* texts)
+void ReadPoints(FileTextView rest, const PointArray* numbers, const PointArray* texts)
 {
     rest = TrimWhite(rest);
-    if (rest.starts_with(L'"') && rest.ends_with(L'"')) {
+    if (rest.bytes.starts_with('"') && rest.bytes.ends_with('"')) {
         if (texts != nullptr)
             ReadTexts(rest, *texts);
     } else if (numbers != nullptr) {
-        ReadNumbers(rest, *numbers);
+        ReadNumbers(rest.bytes, *numbers);
     }
 }
 
-bool ReadPointLine(std::wstring_view keyword, std::wstring_view rest,
+bool ReadPointLine(std::string_view keyword, FileTextView rest,
                    std::span<const PointTarget> targets)
 {
     for (const PointTarget& target : targets) {

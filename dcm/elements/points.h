@@ -3,6 +3,7 @@
 #include "dcm/elements/block_text.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/platform/automation.h"
+#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
 
@@ -28,11 +29,11 @@ void AppendPoint(const PointArray& array, const VARIANT& point);
 void AppendPoint(const PointArray& array, CComVariant&& point);
 
 /// Makes room for as many points as the block announces, but not for more than its text can hold.
-void ReservePoints(std::vector<CComVariant>& points, long long count, std::wstring_view block);
+void ReservePoints(std::vector<CComVariant>& points, long long count, FileTextView block);
 
 /// Reads the items of one point line: quoted texts when it begins and ends with a double quote,
 /// numbers otherwise. Items of a kind without an array are dropped.
-void ReadPoints(std::wstring_view rest, const PointArray* numbers, const PointArray* texts);
+void ReadPoints(FileTextView rest, const PointArray* numbers, const PointArray* texts);
 
 /// Replaces `target` by copies of the points, each text its own; leaves it as it was when memory
 /// runs out.
@@ -59,7 +60,7 @@ struct PointTarget
 
 /// Reads one point line into the target whose keyword it has; false when it has none of them.
 /// Numbers under the keyword of texts are dropped, and the reverse.
-bool ReadPointLine(std::wstring_view keyword, std::wstring_view rest,
+bool ReadPointLine(std::string_view keyword, FileTextView rest,
                    std::span<const PointTarget> targets);
 
 /// Writes the points of an array five to a line; those that are neither number nor text take no

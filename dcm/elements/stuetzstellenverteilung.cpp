@@ -23,15 +23,20 @@ DCMStuetzstellenverteilung::~DCMStuetzstellenverteilung() = default;
 
 HRESULT DCMStuetzstellenverteilung::Init(const CString& strBlock)
 {
-    dcm::BlockLines lines(strBlock);
+    return ReadBlock(dcm::FileTextOfHost(strBlock).View());
+}
+
+HRESULT DCMStuetzstellenverteilung::ReadBlock(dcm::FileTextView block)
+{
+    dcm::BlockLines lines(block);
     dcm::BlockLine line;
     while (lines.Next(line)) {
         if (line.Is(dcm::keyword::kStuetzstellenverteilung))
-            ReadFirstLine(dcm::TrimWhite(line.rest), strBlock);
+            ReadFirstLine(dcm::TrimWhite(line.rest), block);
         else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnit = dcm::TrimBlanksAndQuotes(line.rest);
+            m_strUnit = dcm::TrimBlanksAndQuotes(line.rest).Wide();
         else if (line.Is(dcm::keyword::kStX) || line.Is(dcm::keyword::kStTxX))
             AddValues(line.rest);
         else if (line.Is(dcm::keyword::kStTxY) || line.Is(dcm::keyword::kText))
@@ -41,14 +46,14 @@ HRESULT DCMStuetzstellenverteilung::Init(const CString& strBlock)
 }
 
 /// The name. The count behind it says how much room to make.
-void DCMStuetzstellenverteilung::ReadFirstLine(std::wstring_view rest, std::wstring_view block)
+void DCMStuetzstellenverteilung::ReadFirstLine(dcm::FileTextView rest, dcm::FileTextView block)
 {
-    SetName(dcm::TakeName(rest));
-    dcm::ReservePoints(m_vecValues, dcm::ReadInteger(rest), block);
+    SetName(dcm::TakeName(rest).Wide());
+    dcm::ReservePoints(m_vecValues, dcm::ReadInteger(rest.bytes), block);
 }
 
 /// Numbers and texts are told apart by the quotes alone.
-HRESULT DCMStuetzstellenverteilung::AddValues(std::wstring_view rest)
+HRESULT DCMStuetzstellenverteilung::AddValues(dcm::FileTextView rest)
 {
     const dcm::PointArray values{m_vecValues, m_vtValueType};
     dcm::ReadPoints(rest, &values, &values);

@@ -75,6 +75,20 @@ bool HasHigh(const Words& words)
     return ((words[0] | words[1] | words[2] | words[3]) & 0x8080808080808080U) != 0;
 }
 
+bool HasHigh(std::string_view bytes)
+{
+    unsigned all = 0;
+    std::uint64_t words = 0;
+    for (; bytes.size() >= sizeof words; bytes.remove_prefix(sizeof words)) {
+        std::uint64_t word = 0;
+        std::memcpy(&word, bytes.data(), sizeof word);
+        words |= word;
+    }
+    for (const char c : bytes)
+        all |= static_cast<unsigned char>(c);
+    return ((words | all) & 0x8080808080808080U) != 0;
+}
+
 /// Whether any byte lies from 0x80 to 0x9F: of its upper three bits, only the first is set. The
 /// shifts bring the other two to its place.
 bool HasC1(const Words& words)
@@ -134,8 +148,11 @@ void Replace1252(std::string_view bytes, wchar_t* wide)
                 wide[i] = static_cast<wchar_t>(kHigh1252[byte - 0x80U]);
         }
     };
-    if (bytes.size() < kPiece)
-        return replace(0, bytes.size());
+    if (bytes.size() < kPiece) {
+        if (HasHigh(bytes))
+            replace(0, bytes.size());
+        return;
+    }
     const auto replacePiece = [&](std::size_t begin) {
         const Words words = LoadPiece(bytes.data() + begin);
         if (HasHigh(words) && HasC1(words))
@@ -292,6 +309,27 @@ char* NarrowTo(char* to, std::wstring_view text, Encoding encoding)
     }
 }
 
+/// The bytes of a character in the encoding kWide: six bits of its number in each, from low to
+/// high, and the highest bit.
+constexpr std::size_t kBytesOfWide = sizeof(wchar_t) == 2 ? 3 : 6;
+
+wchar_t* WidenWide(std::string_view bytes, wchar_t* to)
+{
+    while (!bytes.empty()) {
+        const std::size_t ascii = AsciiLength(bytes);
+        to = CopyNumbers(bytes.data(), ascii, to);
+        bytes.remove_prefix(ascii);
+        const std::size_t size = std::min(bytes.size(), kBytesOfWide);
+        std::uint64_t c = 0;
+        for (std::size_t i = 0; i < size; ++i)
+            c |= std::uint64_t{static_cast<unsigned char>(bytes[i]) & 0x3FU} << (6 * i);
+        if (size > 0)
+            *to++ = static_cast<wchar_t>(c);
+        bytes.remove_prefix(size);
+    }
+    return to;
+}
+
 FileText Copy(const std::string& utf8)
 {
     FileText text{std::make_unique_for_overwrite<char[]>(utf8.size()), utf8.size(),
@@ -332,21 +370,48 @@ FileText ToThreadCodePage(FileText text)
     const unsigned codePage = ThreadCodePage();
     if (FindEncoding(codePage))
         return text;
-    return Copy(system::Utf8ToCodePage(codePage, text.View()));
+    return Copy(system::Utf8ToCodePage(codePage, text.Bytes()));
 }
 
-void AppendWide(CString& text, std::string_view bytes, Encoding encoding)
+FileText FileTextOfHost(std::wstring_view text)
 {
+    auto bytes = std::make_unique_for_overwrite<char[]>(text.size() * kBytesOfWide);
+    char* to = bytes.get();
+    for (;;) {
+        const std::size_t ascii = AsciiLength(text);
+        to = CopyNumbers(text.data(), ascii, to);
+        text.remove_prefix(ascii);
+        if (text.empty())
+            break;
+        std::uint32_t c = Number(text[0]);
+        text.remove_prefix(1);
+        for (std::size_t i = 0; i < kBytesOfWide; ++i, c >>= 6)
+            *to++ = static_cast<char>(0x80 | (c & 0x3F));
+    }
+    const auto size = static_cast<std::size_t>(to - bytes.get());
+    return {std::move(bytes), size, Encoding::kWide};
+}
+
+void AppendWide(CString& text, FileTextView view)
+{
+    const std::string_view bytes = view.bytes;
     // No byte of any encoding gives more than one wide character.
     wchar_t* const to = text.Extend(bytes.size());
-    if (encoding == Encoding::kUtf8) {
-        text.EndExtend(WidenUtf8(bytes, to));
-        return;
-    }
+    if (view.encoding == Encoding::kUtf8)
+        return text.EndExtend(WidenUtf8(bytes, to));
+    if (view.encoding == Encoding::kWide)
+        return text.EndExtend(WidenWide(bytes, to));
     // ISO-8859-1 is how Unicode begins.
     text.EndExtend(CopyNumbers(bytes.data(), bytes.size(), to));
-    if (encoding == Encoding::kWindows1252)
+    if (view.encoding == Encoding::kWindows1252)
         Replace1252(bytes, to);
+}
+
+CString FileTextView::Wide() const
+{
+    CString text;
+    AppendWide(text, *this);
+    return text;
 }
 
 CString Widen(std::string_view bytes)
@@ -354,9 +419,9 @@ CString Widen(std::string_view bytes)
     const unsigned codePage = ThreadCodePage();
     CString text;
     if (const auto encoding = FindEncoding(codePage))
-        AppendWide(text, bytes, *encoding);
+        AppendWide(text, {bytes, *encoding});
     else
-        AppendWide(text, system::CodePageToUtf8(codePage, bytes), Encoding::kUtf8);
+        AppendWide(text, {system::CodePageToUtf8(codePage, bytes), Encoding::kUtf8});
     return text;
 }
 
@@ -371,7 +436,7 @@ std::string ToUtf8(std::wstring_view text)
 CString FromUtf8(std::string_view text)
 {
     CString wide;
-    AppendWide(wide, text, Encoding::kUtf8);
+    AppendWide(wide, {text, Encoding::kUtf8});
     return wide;
 }
 

@@ -28,6 +28,19 @@ enum class Encoding : unsigned char
     kWindows1252,
     kLatin1,
     kUtf8,
+    /// Each wide character outside of ASCII as a fixed number of bytes: for text of the host, which
+    /// need not be Unicode.
+    kWide,
+};
+
+/// A piece of text in such an encoding, owned by somebody else.
+struct FileTextView
+{
+    std::string_view bytes;
+    Encoding encoding;
+
+    /// Its wide form. Bytes that are no character in UTF-8 become U+FFFD.
+    CString Wide() const;
 };
 
 /// The bytes of a text file, in an encoding that can be cut.
@@ -39,18 +52,22 @@ struct FileText
     Encoding encoding = Encoding::kWindows1252;
 
     /// The bytes, valid as long as they are owned here.
-    std::string_view View() const { return {bytes.get(), size}; }
+    std::string_view Bytes() const { return {bytes.get(), size}; }
+    FileTextView View() const { return {Bytes(), encoding}; }
 };
 
 /// Takes the bytes of a file in the thread's code page. They stay as they are where that page can
 /// be cut; text of any other page is converted to UTF-8 whole.
 FileText FileTextFromThreadCodePage(std::unique_ptr<char[]> bytes, std::size_t size);
 
-/// Appends the wide form of `bytes`. Bytes that are no character in UTF-8 become U+FFFD.
-void AppendWide(CString& text, std::string_view bytes, Encoding encoding);
+/// Appends the wide form.
+void AppendWide(CString& text, FileTextView bytes);
 
 /// The wide form of `bytes` in the thread's code page.
 CString Widen(std::string_view bytes);
+
+/// `text` with all its characters, in the encoding kWide.
+FileText FileTextOfHost(std::wstring_view text);
 
 /// The other way: `text` in the thread's code page where that can be cut, in UTF-8 otherwise. A
 /// character that the encoding lacks becomes `?`.

@@ -26,6 +26,10 @@ long ReadSome(FileHandle file, void* buffer, std::size_t count, std::size_t& don
 /// Writes what the system takes at once.
 long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size_t& done) noexcept;
 
+/// Says that memory is about to be filled as a whole. Where the system can, it comes in large pages
+/// then, each of which costs one fault; where it cannot, nothing changes.
+void ExpectToFill(void* memory, std::size_t size) noexcept;
+
 long CloseFile(FileHandle file) noexcept;
 
 CFileException::Cause CauseOf(long error) noexcept;

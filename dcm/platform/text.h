@@ -3,13 +3,14 @@
 #include <algorithm>
 #include <string_view>
 
-/// What white space and letter case mean in this format, for views of wide text.
+/// What white space and letter case mean in this format. All that they concern is ASCII, so that
+/// text is cut and compared as it stands in its file.
 namespace dcm {
 
 /// White space is U+0009 to U+000D and U+0020, whatever the locale.
-constexpr bool IsWhite(wchar_t c)
+constexpr bool IsWhite(char c)
 {
-    return c == L' ' || (c >= L'\t' && c <= L'\r');
+    return c == ' ' || (c >= '\t' && c <= '\r');
 }
 
 /// Lower case of A to Z; any other character stays as it is.
@@ -18,19 +19,22 @@ constexpr wchar_t FoldCase(wchar_t c)
     return c >= L'A' && c <= L'Z' ? static_cast<wchar_t>(c + (L'a' - L'A')) : c;
 }
 
-constexpr bool EqualsNoCase(std::wstring_view a, std::wstring_view b)
+/// Whether text of a file is `wide`, a word of ASCII, in letters of any case.
+constexpr bool EqualsNoCase(std::string_view text, std::wstring_view wide)
 {
-    return a.size() == b.size() &&
-           std::equal(a.begin(), a.end(), b.begin(),
-                      [](wchar_t x, wchar_t y) { return x == y || FoldCase(x) == FoldCase(y); });
+    return text.size() == wide.size() &&
+           std::equal(text.begin(), text.end(), wide.begin(), [](char narrow, wchar_t c) {
+               const auto x = static_cast<wchar_t>(static_cast<unsigned char>(narrow));
+               return x == c || FoldCase(x) == FoldCase(c);
+           });
 }
 
 /// `text` without the characters at its start for which `isTrimmed` holds.
 template <class Predicate>
-constexpr std::wstring_view TrimLeft(std::wstring_view text, Predicate isTrimmed)
+constexpr std::string_view TrimLeft(std::string_view text, Predicate isTrimmed)
 {
-    const wchar_t* const end = text.data() + text.size();
-    const wchar_t* start = text.data();
+    const char* const end = text.data() + text.size();
+    const char* start = text.data();
     while (start != end && isTrimmed(*start))
         ++start;
     return {start, static_cast<std::size_t>(end - start)};
@@ -38,9 +42,9 @@ constexpr std::wstring_view TrimLeft(std::wstring_view text, Predicate isTrimmed
 
 /// `text` without the characters at its end for which `isTrimmed` holds.
 template <class Predicate>
-constexpr std::wstring_view TrimRight(std::wstring_view text, Predicate isTrimmed)
+constexpr std::string_view TrimRight(std::string_view text, Predicate isTrimmed)
 {
-    const wchar_t* end = text.data() + text.size();
+    const char* end = text.data() + text.size();
     while (end != text.data() && isTrimmed(end[-1]))
         --end;
     return {text.data(), static_cast<std::size_t>(end - text.data())};
@@ -48,30 +52,30 @@ constexpr std::wstring_view TrimRight(std::wstring_view text, Predicate isTrimme
 
 /// `text` without the characters at both ends for which `isTrimmed` holds.
 template <class Predicate>
-constexpr std::wstring_view Trim(std::wstring_view text, Predicate isTrimmed)
+constexpr std::string_view Trim(std::string_view text, Predicate isTrimmed)
 {
     return TrimRight(TrimLeft(text, isTrimmed), isTrimmed);
 }
 
-constexpr std::wstring_view TrimWhite(std::wstring_view text)
+constexpr std::string_view TrimWhite(std::string_view text)
 {
     return Trim(text, IsWhite);
 }
 
-constexpr std::wstring_view TrimBlanks(std::wstring_view text)
+constexpr std::string_view TrimBlanks(std::string_view text)
 {
-    return Trim(text, [](wchar_t c) { return c == L' '; });
+    return Trim(text, [](char c) { return c == ' '; });
 }
 
-constexpr std::wstring_view TrimQuotes(std::wstring_view text)
+constexpr std::string_view TrimQuotes(std::string_view text)
 {
-    return Trim(text, [](wchar_t c) { return c == L'"'; });
+    return Trim(text, [](char c) { return c == '"'; });
 }
 
 /// `text` without the blanks and double quotes at both ends, in any mix.
-constexpr std::wstring_view TrimBlanksAndQuotes(std::wstring_view text)
+constexpr std::string_view TrimBlanksAndQuotes(std::string_view text)
 {
-    return Trim(text, [](wchar_t c) { return c == L' ' || c == L'"'; });
+    return Trim(text, [](char c) { return c == ' ' || c == '"'; });
 }
 
 } // namespace dcm

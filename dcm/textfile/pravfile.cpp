@@ -1,5 +1,7 @@
 #include "dcm/textfile/pravfile.h"
 
+#include "dcm/platform/system_file.h"
+
 #include <algorithm>
 #include <cstddef>
 #include <cstring>
@@ -20,7 +22,7 @@ void CheckSize(ULONGLONG size)
 /// `text` with CR LF as its only line end. A carriage return that no line feed follows stays.
 dcm::FileText WithCrLf(const dcm::FileText& text)
 {
-    std::string_view rest = text.View();
+    std::string_view rest = text.Bytes();
     // A text of nothing but line feeds becomes twice as long.
     dcm::FileText result{std::make_unique_for_overwrite<char[]>(2 * rest.size()), 0, text.encoding};
     char* to = result.bytes.get();
@@ -68,9 +70,18 @@ void PravFile::LoadContent(UINT flags)
     const ULONGLONG length = GetLength();
     CheckSize(length);
     auto bytes = std::make_unique_for_overwrite<char[]>(length);
-    std::size_t size = Read(bytes.get(), static_cast<UINT>(length));
-    if (const void* const zero = std::memchr(bytes.get(), '\0', size))
-        size = static_cast<std::size_t>(static_cast<const char*>(zero) - bytes.get());
+    dcm::system::ExpectToFill(bytes.get(), length);
+    // In pieces that are still in the cache when the zero byte is looked for.
+    constexpr std::size_t piece = 256 * 1024;
+    std::size_t size = 0;
+    for (std::size_t more = 1; more > 0; size += more) {
+        char* const to = bytes.get() + size;
+        more = Read(to, static_cast<UINT>(std::min<ULONGLONG>(length - size, piece)));
+        if (const void* const zero = std::memchr(to, '\0', more)) {
+            size = static_cast<std::size_t>(static_cast<const char*>(zero) - bytes.get());
+            break;
+        }
+    }
     dcm::FileText content = dcm::FileTextFromThreadCodePage(std::move(bytes), size);
     CheckSize(content.size);
     m_content = std::move(content);
@@ -101,21 +112,20 @@ int PravFile::ReadLine(CString& line)
     std::string_view bytes;
     if (!TakeLine(bytes))
         return 0;
-    dcm::AppendWide(line, bytes, m_content.encoding);
+    dcm::AppendWide(line, {bytes, m_content.encoding});
     return 1;
 }
 
-bool PravFile::ReadBlock(CString& block)
+bool PravFile::ReadBlock(dcm::FileTextView& block)
 {
-    block.Empty();
-    // The lines move together over the carriage returns between them, so that the block can be
-    // widened as one piece.
+    // The lines move together over the carriage returns between them.
     char* const start = m_content.bytes.get() + m_nReadPos;
     char* end = start;
+    block = {{start, end}, m_content.encoding};
     std::string_view line;
     while (TakeLine(line)) {
         if (line.empty()) {
-            dcm::AppendWide(block, {start, end}, m_content.encoding);
+            block.bytes = {start, end};
             return true;
         }
         std::memmove(end, line.data(), line.size());

@@ -30,11 +30,6 @@ public:
     /// Hands out the next line without its line end: 1, or 0 and an empty line when there is none.
     int ReadLine(CString& line);
 
-    /// Hands out the lines up to the next empty one, each followed by one line feed; an empty
-    /// block where two empty lines meet. Returns false, and an empty block, when no further empty
-    /// line follows: what is left is dropped.
-    bool ReadBlock(CString& block);
-
     /// Writes `text` at the file's position in one piece: each line feed, with or without a
     /// carriage return before it, as CR LF, and characters that the thread's code page lacks as
     /// `?`. Returns 1; throws `CFileException` when not all of it could be written.
@@ -46,11 +41,18 @@ protected:
     void LoadContent(UINT flags);
 
 private:
+    friend class DCMConverter;
+
+    /// Hands out the lines up to the next empty one, each followed by one line feed; an empty
+    /// block where two empty lines meet. Returns false, and an empty block, when no further empty
+    /// line follows: what is left is dropped. The block stays valid until the file is opened anew.
+    bool ReadBlock(dcm::FileTextView& block);
+
     /// Cuts the next line off, without its line feed and the carriage returns before that.
     bool TakeLine(std::string_view& line);
 
-    /// Bytes, as wide text takes four times the memory: a line or block is widened when it is
-    /// handed out. Those that have been handed out as a block are used up.
+    /// Bytes, as wide text takes four times the memory: only what is kept of them is widened. Those
+    /// that have been handed out as a block are used up.
     dcm::FileText m_content;
     std::int32_t m_nReadPos = 0;
 };

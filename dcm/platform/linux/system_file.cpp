@@ -5,6 +5,7 @@
 #include <cerrno>
 #include <fcntl.h>
 #include <sys/file.h>
+#include <sys/mman.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -127,6 +128,15 @@ long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size
         if (errno != EINTR)
             return errno;
     }
+}
+
+void ExpectToFill(void* memory, std::size_t size) noexcept
+{
+    const auto page = static_cast<std::uintptr_t>(::sysconf(_SC_PAGESIZE));
+    const auto begin = (reinterpret_cast<std::uintptr_t>(memory) + page - 1) / page * page;
+    const auto end = (reinterpret_cast<std::uintptr_t>(memory) + size) / page * page;
+    if (begin < end)
+        ::madvise(reinterpret_cast<void*>(begin), end - begin, MADV_HUGEPAGE); // Only a hint.
 }
 
 long CloseFile(FileHandle file) noexcept

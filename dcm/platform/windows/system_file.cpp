@@ -120,6 +120,9 @@ long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size
     return 0;
 }
 
+void ExpectToFill(void*, std::size_t) noexcept
+{}
+
 long CloseFile(FileHandle file) noexcept
 {
     return CloseHandle(HandleOf(file)) ? 0 : LastError();
