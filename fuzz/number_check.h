@@ -10,7 +10,9 @@
 #include <cstdint>
 #include <iterator>
 #include <limits>
+#include <locale>
 #include <random>
+#include <sstream>
 #include <string>
 #include <string_view>
 #include <system_error>
@@ -67,15 +69,16 @@ public:
         return Below(2) == 0 ? text : '-' + text;
     }
 
-    /// What the standard library reads, with infinity and zero where it finds no number.
-    static double Parse(std::string_view text)
+    /// What the standard library reads, with infinity and zero for what is out of range.
+    static double Parse(const std::string& text)
     {
-        const char* const end = text.data() + text.size();
         double value = 0;
-        if (std::from_chars(text.data(), end, value).ec == std::errc::result_out_of_range) {
-            long double wider = 0;
-            std::from_chars(text.data(), end, wider);
-            value = static_cast<double>(wider);
+        const auto error = std::from_chars(text.data(), text.data() + text.size(), value).ec;
+        if (error == std::errc::result_out_of_range) {
+            std::istringstream stream(text);
+            stream.imbue(std::locale::classic());
+            if (!(stream >> value)) // Too large: the largest number, with its sign.
+                value *= std::numeric_limits<double>::infinity();
         }
         return value;
     }
