@@ -61,7 +61,7 @@ struct FileText
 FileText FileTextFromThreadCodePage(std::unique_ptr<char[]> bytes, std::size_t size);
 
 /// Appends the wide form.
-void AppendWide(CString& text, FileTextView bytes);
+void AppendWide(CString& text, FileTextView view);
 
 /// The wide form of `bytes` in the thread's code page.
 CString Widen(std::string_view bytes);

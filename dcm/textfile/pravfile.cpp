@@ -72,7 +72,7 @@ void PravFile::LoadContent(UINT flags)
     auto bytes = std::make_unique_for_overwrite<char[]>(length);
     dcm::system::ExpectToFill(bytes.get(), length);
     // In pieces that are still in the cache when the zero byte is looked for.
-    constexpr std::size_t piece = 256 * 1024;
+    constexpr std::size_t piece = 1 << 18;
     std::size_t size = 0;
     for (std::size_t more = 1; more > 0; size += more) {
         char* const to = bytes.get() + size;

@@ -4,6 +4,7 @@
 
 #include <cerrno>
 #include <fcntl.h>
+#include <memory>
 #include <sys/file.h>
 #include <sys/mman.h>
 #include <sys/stat.h>
@@ -132,11 +133,10 @@ long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size
 
 void ExpectToFill(void* memory, std::size_t size) noexcept
 {
-    const auto page = static_cast<std::uintptr_t>(::sysconf(_SC_PAGESIZE));
-    const auto begin = (reinterpret_cast<std::uintptr_t>(memory) + page - 1) / page * page;
-    const auto end = (reinterpret_cast<std::uintptr_t>(memory) + size) / page * page;
-    if (begin < end)
-        ::madvise(reinterpret_cast<void*>(begin), end - begin, MADV_HUGEPAGE); // Only a hint.
+    // The whole pages in it.
+    const auto page = static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
+    if (std::align(page, page, memory, size) != nullptr)
+        ::madvise(memory, size / page * page, MADV_HUGEPAGE); // Only a hint.
 }
 
 long CloseFile(FileHandle file) noexcept
