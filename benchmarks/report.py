@@ -150,8 +150,8 @@ def write_page(results):
     }
     CHART.parent.mkdir(parents=True, exist_ok=True)
     CHART.write_text(chart.draw(medians))
-    figures = f"{table(results)}\n\nProcessor: {processor()}."
-    page = re.sub(r"(<!-- figures -->\n).*?(\n<!-- end of figures -->)",
+    figures = f"{table(results)}\n\nProcessor: {processor()}.\n"
+    page = re.sub(r"(<!-- figures -->\n).*?(<!-- end of figures -->)",
                   lambda marks: marks.group(1) + figures + marks.group(2),
                   PAGE.read_text(), flags=re.DOTALL)
     PAGE.write_text(page)
