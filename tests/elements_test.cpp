@@ -243,6 +243,21 @@ TEST(Map, GivesItsPartsToAClassOfTheHost)
                            "    ST/X 1.0    2.0   \n    ST/Y 1.0   \n    WERT 1.0    2.0   \n");
 }
 
+TEST(Map, DropsOneCharacterWhereAnOpeningQuoteStands)
+{
+    DCMKennfeld map;
+    map.Init(L"ST_TX/X \"a\" \u00FCber \"b\"\n");
+    std::vector<CComVariant> axis;
+    map.GetAxis_X(axis);
+    ASSERT_EQ(axis.size(), 3U);
+    EXPECT_EQ(CComVariant::TextOf(axis[1]), L"ber ");
+    EXPECT_EQ(CComVariant::TextOf(axis[2]), L"");
+    DCMFestwerteblock block;
+    block.Init(L"FESTWERTEBLOCK M 4 @\u00FC3\n");
+    EXPECT_EQ(block.GetXValueCount(), 4);
+    EXPECT_EQ(block.GetYValueCount(), 3);
+}
+
 TEST(Map, KeepsEveryCharacterOfTheHost)
 {
     // Characters of one to four bytes, halves of pairs, and numbers that no character has.

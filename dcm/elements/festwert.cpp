@@ -102,7 +102,20 @@ void DCMFestwert::ReadText(dcm::FileTextView text)
     else if (text.bytes == "false")
         m_value = 0.0;
     else
-        m_value.SetText(dcm::TrimQuotes(dcm::TrimWhite(text)).Wide());
+        SetText(dcm::TrimQuotes(dcm::TrimWhite(text)));
+}
+
+/// Whichever memory is missing, the value says so.
+void DCMFestwert::SetText(dcm::FileTextView text)
+{
+    try {
+        m_value.SetText(text.Wide());
+    } catch (...) {
+        VariantClear(&m_value);
+        m_value.vt = VT_ERROR;
+        m_value.scode = E_OUTOFMEMORY;
+        throw;
+    }
 }
 
 HRESULT DCMFestwert::Export(PravFile& file)

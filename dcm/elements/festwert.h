@@ -61,6 +61,7 @@ protected:
 private:
     friend class DCMConverter;
     void ReadText(dcm::FileTextView text);
+    void SetText(dcm::FileTextView text);
     /// Init for the text of a file.
     HRESULT ReadBlock(dcm::FileTextView block);
     /// Composes the block in `block`, which is empty before.

@@ -90,9 +90,12 @@ void DCMFestwerteblock::ReadFirstLine(dcm::FileTextView rest)
     const std::size_t at = counts.find('@');
     if (at == counts.npos || at == 0)
         return;
-    // A blank stands on either side of the "@".
+    // A blank, or another character, stands on either side of the "@".
     m_nXValueCount = dcm::ReadInteger(counts.substr(0, at - 1));
-    m_nYValueCount = dcm::ReadInteger(counts.size() > at + 2 ? counts.substr(at + 2) : "");
+    rest.bytes = counts.substr(at + 1);
+    if (!rest.bytes.empty())
+        rest.DropFirst();
+    m_nYValueCount = dcm::ReadInteger(rest.bytes);
 }
 
 HRESULT DCMFestwerteblock::AddValues(dcm::FileTextView rest)

@@ -392,7 +392,7 @@ void NumberReader::Load(std::string_view text)
 {
     m_text = text;
     const auto size = std::min(text.size(), kPiece);
-    std::memcpy(m_piece.data(), text.data(), size);
+    text.copy(reinterpret_cast<char*>(m_piece.data()), size);
     std::memset(m_piece.data() + size, 0, kBehind);
     m_at = m_piece.data();
     m_end = m_at + size;

@@ -35,6 +35,8 @@ class NumberReader
 {
 public:
     explicit NumberReader(std::string_view text) noexcept { Load(text); }
+    NumberReader(const NumberReader&) = delete;
+    NumberReader& operator=(const NumberReader&) = delete;
 
     /// Reads the token in front of the next blank (all that is left, without a blank) as ReadNumber
     /// does, then skips that blank and the white space behind it. Returns whether a blank ended the
@@ -45,8 +47,8 @@ public:
     std::string_view Rest() const noexcept { return m_text.substr(Position()); }
 
 private:
-    /// Characters that are looked at together, and the most that a number takes which is read the
-    /// fast way.
+    /// Characters that are looked at together, and how many of them must be left for a number to be
+    /// read from them.
     static constexpr std::size_t kPiece = 512;
     static constexpr std::size_t kLongest = 64;
     static constexpr std::size_t kBehind = 8;

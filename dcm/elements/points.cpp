@@ -44,9 +44,9 @@ void ReadNumbers(std::string_view rest, const PointArray& array)
 /// the next quote or with the line.
 void ReadTexts(FileTextView line, const PointArray& array)
 {
-    std::string_view rest = line.bytes;
+    std::string_view& rest = line.bytes;
     while (!rest.empty()) {
-        rest.remove_prefix(1);
+        line.DropFirst();
         const std::size_t end = rest.find('"');
         const FileTextView text = {rest.substr(0, end), line.encoding};
         rest = end == rest.npos ? std::string_view() : TrimWhite(rest.substr(end + 1));

@@ -395,6 +395,8 @@ FileText FileTextOfHost(std::wstring_view text)
 void AppendWide(CString& text, FileTextView view)
 {
     const std::string_view bytes = view.bytes;
+    if (bytes.empty())
+        return;
     // No byte of any encoding gives more than one wide character.
     wchar_t* const to = text.Extend(bytes.size());
     if (view.encoding == Encoding::kUtf8)
@@ -405,6 +407,16 @@ void AppendWide(CString& text, FileTextView view)
     text.EndExtend(CopyNumbers(bytes.data(), bytes.size(), to));
     if (view.encoding == Encoding::kWindows1252)
         Replace1252(bytes, to);
+}
+
+void FileTextView::DropFirst()
+{
+    if (encoding == Encoding::kUtf8)
+        TakeUtf8(bytes);
+    else if (encoding == Encoding::kWide && HasHigh(bytes.substr(0, 1)))
+        bytes.remove_prefix(std::min(bytes.size(), kBytesOfWide));
+    else
+        bytes.remove_prefix(1);
 }
 
 CString FileTextView::Wide() const

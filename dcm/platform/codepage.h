@@ -21,8 +21,9 @@ DCM_API bool SetThreadCodePage(unsigned identifier);
 // The library's own, not exported.
 /// @cond
 
-/// Encodings in which a text can be cut at a line feed or a zero byte before it is widened: these
-/// bytes stand for themselves and are part of no other character.
+/// Encodings in which a text can be cut at any character of ASCII before it is widened: its bytes
+/// stand for themselves and are part of no other character. No other character may be taken for one
+/// byte.
 enum class Encoding : unsigned char
 {
     kWindows1252,
@@ -41,6 +42,8 @@ struct FileTextView
 
     /// Its wide form. Bytes that are no character in UTF-8 become U+FFFD.
     CString Wide() const;
+    /// Drops the first character; the text is not empty.
+    void DropFirst();
 };
 
 /// The bytes of a text file, in an encoding that can be cut.

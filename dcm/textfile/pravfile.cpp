@@ -71,17 +71,9 @@ void PravFile::LoadContent(UINT flags)
     CheckSize(length);
     auto bytes = std::make_unique_for_overwrite<char[]>(length);
     dcm::system::ExpectToFill(bytes.get(), length);
-    // In pieces that are still in the cache when the zero byte is looked for.
-    constexpr std::size_t piece = 1 << 18;
-    std::size_t size = 0;
-    for (std::size_t more = 1; more > 0; size += more) {
-        char* const to = bytes.get() + size;
-        more = Read(to, static_cast<UINT>(std::min<ULONGLONG>(length - size, piece)));
-        if (const void* const zero = std::memchr(to, '\0', more)) {
-            size = static_cast<std::size_t>(static_cast<const char*>(zero) - bytes.get());
-            break;
-        }
-    }
+    std::size_t size = Read(bytes.get(), static_cast<UINT>(length));
+    if (const void* const zero = std::memchr(bytes.get(), '\0', size))
+        size = static_cast<std::size_t>(static_cast<const char*>(zero) - bytes.get());
     dcm::FileText content = dcm::FileTextFromThreadCodePage(std::move(bytes), size);
     CheckSize(content.size);
     m_content = std::move(content);
