@@ -55,7 +55,7 @@ public:
     void SetUnit(const CString& strUnit) { m_strUnit = strUnit; }
 
 protected:
-    /// The first word of the block.
+    /// The first word of the block, of ASCII.
     CString m_strKeyword;
 
 private:

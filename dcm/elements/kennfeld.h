@@ -117,7 +117,7 @@ private:
     CString m_strUnitW;
 
 protected:
-    /// The first word of the block.
+    /// The first word of the block, of ASCII.
     CString m_strKeyword;
 
 private:

@@ -69,10 +69,10 @@ void AppendWide(CString& text, FileTextView view);
 /// The wide form of `bytes` in the thread's code page.
 CString Widen(std::string_view bytes);
 
-/// `text` with all its characters, in the encoding kWide.
+/// `text` to be read like that of a file: all its characters, in the encoding kWide.
 FileText FileTextOfHost(std::wstring_view text);
 
-/// The other way: `text` in the thread's code page where that can be cut, in UTF-8 otherwise. A
+/// `text` for a file: in the thread's code page where that can be cut, in UTF-8 otherwise. A
 /// character that the encoding lacks becomes `?`.
 FileText FileTextFromWide(std::wstring_view text);
 
