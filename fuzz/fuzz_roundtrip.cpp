@@ -1,64 +1,49 @@
 // Any file is read; what is written from it reads back and is written again. A document that is
 // settled, in the sense below, gives the same bytes both times.
 
-#include "dcm/library/dcm.h"
-#include "dcm/platform/text.h"
 #include "fuzz/kinds.h"
 #include "fuzz/memory_file.h"
 #include "fuzz/target.h"
+#include "tests/support.h"
 
 #include <algorithm>
 #include <cmath>
-#include <list>
-#include <string>
-#include <string_view>
-#include <type_traits>
-#include <vector>
 
 namespace {
 
-constexpr std::wstring_view kQuotes = L"\"";
-constexpr std::wstring_view kWhiteAndQuotes = L" \t\n\v\f\r\"";
-
-/// Whether `text` has none of `lost` at its ends, where the reader would take them off.
-bool KeepsEnds(std::wstring_view text, std::wstring_view lost)
+/// Whether the texts come back as they are: at their ends the reader takes white space and quotes
+/// off, a backslash keeps a quote from closing, and a truth word becomes a number.
+bool AreSettled(std::initializer_list<std::wstring_view> texts)
 {
-    return text.empty() ||
-           (lost.find(text.front()) == lost.npos && lost.find(text.back()) == lost.npos);
+    constexpr std::wstring_view kLost = L" \t\n\v\f\r\"\\";
+    return std::all_of(texts.begin(), texts.end(), [&](std::wstring_view text) {
+        return text.empty() ||
+               (kLost.find(text.front()) == kLost.npos && kLost.find(text.back()) == kLost.npos &&
+                text != L"true" && text != L"false");
+    });
 }
 
-/// The reader takes quotes, and then blanks, off a text once: what stands behind them may be
-/// quotes or white space again. A text that looks like a truth word becomes a number.
 bool IsSettled(const DCMFestwert& block)
 {
     CComVariant value;
     Require(block.GetValue(&value) == S_OK && value.vt == block.GetValueType(), "GetValue");
-    const std::wstring_view text =
-        value.vt == VT_BSTR ? CComVariant::TextOf(value) : std::wstring_view();
-    return KeepsEnds(block.GetName(), kWhiteAndQuotes) && KeepsEnds(block.GetLangname(), kQuotes) &&
-           KeepsEnds(block.GetDisplayname(), kQuotes) &&
-           KeepsEnds(block.GetFunction(), kWhiteAndQuotes) && KeepsEnds(block.GetUnit(), kQuotes) &&
-           KeepsEnds(text, kWhiteAndQuotes) && text != L"true" && text != L"false";
+    return AreSettled({block.GetName(), block.GetLangname(), block.GetDisplayname(),
+                       block.GetFunction(), block.GetUnit(),
+                       value.vt == VT_BSTR ? CComVariant::TextOf(value) : std::wstring_view()});
 }
 
-/// In a list of texts the first and last of a line lose blanks and quotes at their ends, and an
-/// empty text, a quote or a backslash in front of one can join texts. Rows have 15 digits: numbers
-/// at the limit of the range round up to infinity. Without a name, the count is taken for it.
+/// An empty text and a quote can join texts. Rows have 15 digits: numbers at the limit of the range
+/// round up to infinity. Without a name, the count is taken for it.
 bool IsSettled(const DCMFestwerteblock& block)
 {
-    constexpr double kLargestOf15Digits = 1.79769313486231e308;
-    const std::list<double> numbers = block.GetDoubleValues();
-    const std::list<CString> texts = block.GetStringValues();
-    const bool rows = block.GetXValueCount() > 0 && block.GetYValueCount() > 0;
+    const auto numbers = block.GetDoubleValues();
+    const auto texts = block.GetStringValues();
     return (block.GetYValueCount() == 0 || !block.GetName().IsEmpty()) &&
-           KeepsEnds(block.GetName(), L" \t\n\v\f\r") &&
-           KeepsEnds(block.GetFunction(), kWhiteAndQuotes) &&
+           AreSettled({block.GetName(), block.GetFunction()}) &&
            std::all_of(numbers.begin(), numbers.end(),
-                       [&](double d) {
-                           return !rows || std::isinf(d) || std::fabs(d) <= kLargestOf15Digits;
-                       }) &&
+                       [](double d) { return std::isinf(d) || std::fabs(d) < 1.797e308; }) &&
            (!numbers.empty() || std::all_of(texts.begin(), texts.end(), [](std::wstring_view t) {
-               return !t.empty() && KeepsEnds(t, L" \t\n\v\f\r\\") && t.find(L'"') == t.npos;
+               return !t.empty() && AreSettled({t}) && t.find(L'"') == t.npos;
            }));
 }
 
@@ -93,11 +78,11 @@ bool IsSettled(const DCMKennfeld& block)
 bool IsSettled(const DCMConverter& document, std::vector<std::size_t>& counts)
 {
     bool settled = true;
-    ForEachKind([&](auto get, auto) {
+    ForEachKind([&](const char*, auto get, auto) {
         const auto blocks = (document.*get)();
         for (const auto& block : blocks)
             settled = IsSettled(block) && settled;
-        if constexpr (!std::is_base_of_v<DCMKennfeld, typename decltype(blocks)::value_type>)
+        if constexpr (!std::is_base_of_v<DCMKennfeld, BlockOf<decltype(get)>>)
             counts.push_back(blocks.size());
     });
     return settled;
@@ -118,13 +103,13 @@ unsigned TakeCodePage(std::string_view& bytes)
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
-    static MemoryFile file;
+    const CString& file = MemoryFile();
     std::string_view bytes(reinterpret_cast<const char*>(data), size);
     Require(dcm::SetThreadCodePage(TakeCodePage(bytes)), "the code page is known");
-    file.SetBytes(bytes);
+    std::ofstream(test::PathOf(file), std::ios::binary) << bytes;
 
     DCMConverter document;
-    const HRESULT imported = document.Import(file.Path());
+    const HRESULT imported = document.Import(file);
     Require(imported == S_OK || imported == E_UNEXPECTED, "the result of an import");
     Require(document.GetComment().GetLength() <= static_cast<int>(size), "the comment's length");
 
@@ -134,8 +119,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     for (int pass = 0; pass < 3; ++pass) {
         std::vector<std::size_t> counts;
         const bool settled = IsSettled(document, counts);
-        Require(document.Export(file.Path()) == S_OK, "an export succeeds");
-        const std::string exported = file.Bytes();
+        Require(document.Export(file) == S_OK, "an export succeeds");
+        const std::string exported = test::ReadBytes(file);
         Require(pass == 0 || counts == countsBefore, "every block comes back");
         Require(!settledBefore || settled, "a settled document stays settled");
         Require(!settledBefore || exported == before, "a settled document comes back");
@@ -146,9 +131,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         countsBefore = counts;
         settledBefore = settled;
         DCMConverter next;
-        Require(next.Import(file.Path()) == S_OK, "an exported file is read");
-        DCMConverter copy(next);
-        document = copy;
+        Require(next.Import(file) == S_OK, "an exported file is read");
+        document = DCMConverter(next);
     }
     return 0;
 }

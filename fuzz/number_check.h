@@ -2,20 +2,18 @@
 
 #include "dcm/elements/number.h"
 
-#include <array>
+#include <algorithm>
 #include <bit>
 #include <charconv>
 #include <cmath>
-#include <cstddef>
 #include <cstdint>
+#include <iomanip>
 #include <iterator>
 #include <limits>
 #include <locale>
 #include <random>
 #include <sstream>
 #include <string>
-#include <string_view>
-#include <system_error>
 
 /// Numbers and number texts of every kind from a seed: those that are frequent in files, and those
 /// that are hard to round.
@@ -41,27 +39,25 @@ public:
     /// A text that is a decimal number as a whole.
     std::string Text()
     {
-        std::array<char, 1600> buffer;
-        char* const begin = buffer.data();
-        char* const end = begin + buffer.size();
+        using enum std::chars_format;
+        constexpr std::chars_format formats[] = {general, scientific, fixed};
+        char buffer[1600];
+        const auto write = [&](auto... number) {
+            return std::string(buffer, std::to_chars(buffer, std::end(buffer), number...).ptr);
+        };
         const double number = Number();
         const int kind = Below(16);
         if (kind < 6)
-            return {begin, std::to_chars(begin, end, number).ptr};
-        if (kind < 12) {
-            using enum std::chars_format;
-            constexpr std::chars_format formats[] = {general, scientific, fixed};
-            return {begin, std::to_chars(begin, end, number, formats[Below(3)], Below(25)).ptr};
-        }
+            return write(number);
+        if (kind < 12)
+            return write(number, formats[Below(3)], Below(25));
+        std::string text;
         if (kind == 12) { // half-way between two numbers, or a little above
             const auto next = std::nextafter(number, std::numeric_limits<double>::max());
-            const auto half = (static_cast<long double>(number) + next) / 2;
-            std::string text(
-                begin, std::to_chars(begin, end, half, std::chars_format::scientific, 780).ptr);
+            text = write((static_cast<long double>(number) + next) / 2, scientific, 780);
             text[text.find('e') - 1] = "01"[Below(2)];
             return text;
         }
-        std::string text;
         for (int i = 1 + Below(Below(4) == 0 ? 400 : 24); i > 0; --i)
             text += "0123456789"[Below(10)];
         text.insert(static_cast<std::size_t>(Below(static_cast<int>(text.size()))), ".");
@@ -73,13 +69,10 @@ public:
     static double Parse(const std::string& text)
     {
         double value = 0;
-        const auto error = std::from_chars(text.data(), text.data() + text.size(), value).ec;
-        if (error == std::errc::result_out_of_range) {
-            std::istringstream stream(text);
-            stream.imbue(std::locale::classic());
-            if (!(stream >> value)) // Too large: the largest number, with its sign.
-                value *= std::numeric_limits<double>::infinity();
-        }
+        std::istringstream stream(text);
+        stream.imbue(std::locale::classic());
+        if (!(stream >> value)) // Too large: the largest number, with its sign.
+            value *= std::numeric_limits<double>::infinity();
         return value;
     }
 
@@ -104,34 +97,50 @@ inline std::string Text(double number, int digits)
     return {static_cast<const wchar_t*>(text.data()), end};
 }
 
-/// What is wrong with how `token` is read, alone and with others behind it in its line, where room
-/// lets more be read at once; empty if nothing is.
-inline std::string WrongNumber(const std::string& token, double expected)
+/// What is wrong with how the numbers of a line are read, each alone and behind the one before;
+/// empty if nothing is. `expected` tells the number of a token.
+template <class Expected>
+std::string WrongLine(const std::string& line, Expected expected)
 {
-    for (const std::string_view tail : {"", " ", "   \t 7.25       "}) {
-        const std::string line = std::string(token).append(tail);
-        dcm::NumberReader numbers(line);
+    dcm::NumberReader numbers(line);
+    bool more = true;
+    for (std::size_t start = 0; more;) {
+        const std::size_t blank = std::min(line.find(' ', start), line.size());
+        const std::string token = line.substr(start, blank - start);
+        const double right = expected(token);
         double taken = 1;
-        if (numbers.Next(taken) == tail.empty() ||
-            numbers.Rest() != tail.substr(tail.size() < 2 ? tail.size() : 5))
-            return "what follows the number";
-        const double read = dcm::ReadNumber(token);
-        for (const double number : {read, taken})
-            if (std::bit_cast<std::uint64_t>(number) != std::bit_cast<std::uint64_t>(expected))
+        more = numbers.Next(taken);
+        for (const double number : {taken, dcm::ReadNumber(token)})
+            if (std::bit_cast<std::uint64_t>(number) != std::bit_cast<std::uint64_t>(right))
                 return token + " is " + std::to_string(number);
+        start = std::min(line.find_first_not_of(" \t\n\v\f\r", blank), line.size());
+        if (more != (blank < line.size()) || numbers.Rest().size() != line.size() - start)
+            return token + " is not followed by" + line.substr(start);
     }
     return {};
 }
 
-/// What is wrong with the text of a finite number by the standard library's measure; empty if
-/// nothing is.
+/// What is wrong with how `token` is read in lines where it is the first or only one.
+inline std::string WrongNumber(const std::string& token, double expected)
+{
+    std::string wrong;
+    for (const char* tail : {"", " ", "   \t 7.25       "})
+        wrong += WrongLine(token + tail, [&](const std::string& found) {
+            return found == token ? expected : found.empty() ? 0 : 7.25;
+        });
+    return wrong;
+}
+
+/// What is wrong with the text of a number by the standard library's measure; empty if nothing is.
 inline std::string WrongText(double number)
 {
+    if (!std::isfinite(number))
+        return Text(number, dcm::kFullDigits).find("1.#") < 3 ? "" : "no name";
     for (const int digits : {dcm::kFullDigits, dcm::kShortDigits}) {
-        char buffer[64] = " ";
-        constexpr auto kGeneral = std::chars_format::general;
-        std::string expected(
-            buffer, std::to_chars(buffer + 1, std::end(buffer), number, kGeneral, digits).ptr);
+        std::ostringstream stream;
+        stream.imbue(std::locale::classic());
+        stream << ' ' << std::setprecision(digits) << number;
+        std::string expected = stream.str();
         const auto letter = expected.find('e');
         if (letter != expected.npos)
             expected.insert(letter + 2, expected.size() - letter == 4 ? 1 : 0, '0');
@@ -139,10 +148,6 @@ inline std::string WrongText(double number)
             expected += ".0";
         if (const std::string text = Text(number, digits); text != expected)
             return "not" + expected + " but" + text;
-        if (digits == dcm::kFullDigits)
-            if (auto wrong = WrongNumber({expected.begin() + 1, expected.end()}, number);
-                !wrong.empty())
-                return wrong;
     }
-    return {};
+    return WrongNumber(Text(number, dcm::kFullDigits).substr(1), number);
 }

@@ -1,36 +1,17 @@
-// Runs a target over files and folders of files, without libFuzzer.
+// Runs a target over the files of a folder, without libFuzzer.
 
 #include "fuzz/target.h"
+#include "tests/support.h"
 
-#include <filesystem>
-#include <fstream>
-#include <iterator>
-#include <string>
-
-namespace {
-
-int replayed = 0;
-
-void Replay(const std::filesystem::path& path)
+int main(int, char** argv)
 {
-    if (std::filesystem::is_directory(path)) {
-        for (const auto& entry : std::filesystem::directory_iterator(path))
-            Replay(entry.path());
-        return;
+    int replayed = 0;
+    for (const auto& entry : std::filesystem::directory_iterator(argv[1])) {
+        std::printf("%s\n", entry.path().c_str());
+        std::fflush(stdout);
+        const std::string bytes = test::ReadBytes(CString(entry.path().wstring()));
+        LLVMFuzzerTestOneInput(reinterpret_cast<const std::uint8_t*>(bytes.data()), bytes.size());
+        ++replayed;
     }
-    std::ifstream file(path, std::ios::binary);
-    const std::string bytes(std::istreambuf_iterator<char>(file), {});
-    std::printf("%s\n", path.c_str());
-    std::fflush(stdout);
-    LLVMFuzzerTestOneInput(reinterpret_cast<const std::uint8_t*>(bytes.data()), bytes.size());
-    ++replayed;
-}
-
-} // namespace
-
-int main(int argc, char** argv)
-{
-    for (int i = 1; i < argc; ++i)
-        Replay(argv[i]);
     return replayed > 0 ? 0 : 1;
 }

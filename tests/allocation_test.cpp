@@ -107,7 +107,7 @@ TEST(Allocation, FailureIsTheResultOfImportAndExport)
 
 TEST(Allocation, FailureIsRaisedByTheCallsOfABlock)
 {
-    ForEachKind([](auto get, auto add) {
+    ForEachKind([](const char*, auto get, auto add) {
         FailEach("a block", true, [=](State& s) {
             auto blocks = (s.source.*get)();
             auto block(blocks.front());

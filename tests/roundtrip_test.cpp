@@ -11,7 +11,7 @@ namespace {
 DCMConverter Rebuilt(const DCMConverter& document)
 {
     DCMConverter copy;
-    ForEachKind([&](auto get, auto add) {
+    ForEachKind([&](const char*, auto get, auto add) {
         for (const auto& block : (document.*get)())
             EXPECT_EQ((copy.*add)(block), S_OK);
     });
@@ -51,7 +51,7 @@ TEST(RoundTrip, KeepsACopyOfEachBlockApart)
 {
     DCMConverter document;
     ASSERT_EQ(document.Import(kAllKinds), S_OK);
-    ForEachKind([&](auto get, auto) {
+    ForEachKind([&](const char*, auto get, auto) {
         for (auto block : (document.*get)()) {
             decltype(block) copy(block), assigned;
             assigned = block;

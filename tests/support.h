@@ -8,11 +8,13 @@
 #include <iterator>
 #include <ostream>
 #include <random>
+#include <sstream>
 #include <string>
 #include <string_view>
 #include <system_error>
 #include <type_traits>
 #include <utility>
+#include <vector>
 
 /// How a failed comparison shows a text.
 inline void PrintTo(const CString& text, std::ostream* out)
@@ -87,6 +89,23 @@ inline std::string Unmarked(std::string text)
     return text;
 }
 
+/// The words of each line in a file of data/, where two single quotes stand for an empty one; lines
+/// that begin with # are comments.
+inline std::vector<std::vector<std::string>> Rows(const CString& path)
+{
+    std::istringstream lines(ReadBytes(path));
+    std::vector<std::vector<std::string>> rows;
+    for (std::string line; std::getline(lines, line);) {
+        if (line.empty() || line[0] == '#')
+            continue;
+        rows.emplace_back();
+        std::istringstream words(line);
+        for (std::string word; words >> word;)
+            rows.back().push_back(word == "''" ? "" : Unmarked(word));
+    }
+    return rows;
+}
+
 /// `text` in the thread's code page.
 inline std::string Narrow(std::wstring_view text)
 {
@@ -95,29 +114,28 @@ inline std::string Narrow(std::wstring_view text)
 
 /// What a block writes, with single line feeds. `block` is changed as its export changes it.
 template <class Block>
-std::string Written(Block&& block)
+std::string Written(Block&& block, const CString& path = Folder() / L"block")
 {
-    const Folder folder;
-    PravFile file(folder / L"block", kCreate);
+    PravFile file(path, kCreate);
     if (block.Export(file) != S_OK)
         return "failed";
     file.Close();
-    return Replaced(ReadBytes(folder / L"block"), "\r\n", "\n");
+    return Replaced(ReadBytes(path), "\r\n", "\n");
 }
 
 /// Imports a file of these bytes.
-inline HRESULT ImportBytes(DCMConverter& document, std::string_view bytes)
+inline HRESULT ImportBytes(DCMConverter& document, std::string_view bytes,
+                           const CString& path = Folder() / L"in.dcm")
 {
-    const Folder folder;
-    WriteBytes(folder / L"in.dcm", bytes);
-    return document.Import(folder / L"in.dcm");
+    WriteBytes(path, bytes);
+    return document.Import(path);
 }
 
 /// The bytes of the document's file.
-inline std::string ExportBytes(const DCMConverter& document)
+inline std::string ExportBytes(const DCMConverter& document,
+                               const CString& path = Folder() / L"out.dcm")
 {
-    const Folder folder;
-    return document.Export(folder / L"out.dcm") == S_OK ? ReadBytes(folder / L"out.dcm") : "failed";
+    return document.Export(path) == S_OK ? ReadBytes(path) : "failed";
 }
 
 inline std::string Show(const CString& text)
