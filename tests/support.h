@@ -71,6 +71,13 @@ inline void WriteBytes(const CString& path, std::string_view bytes)
     std::ofstream(PathOf(path), std::ios::binary) << bytes;
 }
 
+/// Why the file cannot be opened, or none.
+inline CFileException::Cause CauseOf(const CString& path, UINT flags)
+{
+    CFileException error;
+    return CFile().Open(path, flags, &error) ? CFileException::none : error.m_cause;
+}
+
 /// Every `from` in `text` as `to`.
 inline std::string Replaced(std::string text, std::string_view from, std::string_view to)
 {

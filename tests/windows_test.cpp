@@ -6,23 +6,13 @@
 
 using namespace test;
 
-namespace {
-
-CFileException::Cause CauseOfOpening(const CString& path, UINT flags)
-{
-    CFileException error;
-    return CFile().Open(path, flags, &error) ? CFileException::none : error.m_cause;
-}
-
-} // namespace
-
 TEST(WindowsFile, RefusesPipes)
 {
     const CString path(L"\\\\.\\pipe\\dcm_test");
     for (const UINT flags : {kRead, kCreate}) {
         const HANDLE pipe = CreateNamedPipeW(path, PIPE_ACCESS_DUPLEX, 0, 1, 16, 16, 0, nullptr);
         ASSERT_NE(pipe, INVALID_HANDLE_VALUE);
-        EXPECT_EQ(CauseOfOpening(path, flags), CFileException::accessDenied);
+        EXPECT_EQ(CauseOf(path, flags), CFileException::accessDenied);
         CloseHandle(pipe);
     }
 }
@@ -39,7 +29,7 @@ TEST(WindowsFile, IsRefusedWhileAnotherProgramHasItOpen)
         CreateFileW(path, GENERIC_READ, kShareWithAll, nullptr, OPEN_EXISTING, 0, nullptr);
     ASSERT_NE(other, INVALID_HANDLE_VALUE);
     document.SetHeader(L"new");
-    EXPECT_EQ(CauseOfOpening(path, kCreate), CFileException::sharingViolation);
+    EXPECT_EQ(CauseOf(path, kCreate), CFileException::sharingViolation);
     EXPECT_EQ(document.Import(path), E_UNEXPECTED);
     EXPECT_EQ(document.Export(path), E_UNEXPECTED);
     EXPECT_EQ(ReadBytes(path), before);
