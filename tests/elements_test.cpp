@@ -6,9 +6,7 @@
 
 #include <chrono>
 #include <cstdint>
-#include <limits>
 #include <tuple>
-#include <utility>
 
 using namespace test;
 
@@ -28,23 +26,6 @@ std::string ValueOf(const DCMFestwert& block)
     return block.GetValue(&value) == S_OK ? Show(value) : "failed";
 }
 
-std::string AxisX(const DCMKennfeld& map)
-{
-    return Points(map, &DCMKennfeld::GetAxis_X);
-}
-
-/// The text of a FESTWERTEBLOCK without its LANGNAME line and its end.
-template <class Value>
-std::string Lines(std::initializer_list<Value> values, int x, int y)
-{
-    DCMFestwerteblock block;
-    for (const Value& value : values)
-        block.AddValue(value);
-    block.SetXValueCount(x);
-    block.SetYValueCount(y);
-    return Replaced(Replaced(Written(block), "    LANGNAME \"\"\n", ""), "END\n\n", "");
-}
-
 /// A map class of the host's own.
 struct HostMap : DCMKennfeld
 {
@@ -61,27 +42,27 @@ struct HostMap : DCMKennfeld
 
 TEST(Festwert, WritesAValueOfAnyTag)
 {
-    const std::pair<CComVariant, std::string> cases[] = {
-        {0.1, "WERT 0.10000000000000001"},
-        {CComVariant(), "WERT 0.0"},
-        {L"a\r\nb\t\"c\"\\", "TEXT \"a..b\t\"c\"\\\""},
-        {Tagged(VT_BSTR), "TEXT \"\""},
-        {7, "WERT 7.0"},
-        {4000000000U, "WERT 4000000000.0"},
-        {static_cast<signed char>(-1), "WERT -1.0"},
-        {std::uint8_t{255}, "WERT 255.0"},
-        {std::int16_t{-2}, "WERT -2.0"},
-        {std::uint16_t{65535}, "WERT 65535.0"},
-        {-(std::int64_t{1} << 40), "WERT -1099511627776.0"},
-        {~std::uint64_t{0}, "WERT 1.8446744073709552e+019"},
-        {0.5F, "WERT 0.5"},
-        {true, "WERT 1.0"},
-        {false, "WERT 0.0"}};
-    for (const auto& [value, line] : cases) {
+    const std::tuple<CComVariant, VARTYPE, std::string> cases[] = {
+        {0.1, VT_R8, "WERT 0.10000000000000001"},
+        {CComVariant(), VT_EMPTY, "WERT 0.0"},
+        {L"a\r\nb\t\"c\"\\", VT_BSTR, "TEXT \"a..b\t\"c\"\\\""},
+        {Tagged(VT_BSTR), VT_BSTR, "TEXT \"\""},
+        {7, VT_I4, "WERT 7.0"},
+        {4000000000U, VT_UI4, "WERT 4000000000.0"},
+        {static_cast<signed char>(-1), VT_I1, "WERT -1.0"},
+        {std::uint8_t{255}, VT_UI1, "WERT 255.0"},
+        {std::int16_t{-2}, VT_I2, "WERT -2.0"},
+        {std::uint16_t{65535}, VT_UI2, "WERT 65535.0"},
+        {-(std::int64_t{1} << 40), VT_I8, "WERT -1099511627776.0"},
+        {~std::uint64_t{0}, VT_UI8, "WERT 1.8446744073709552e+019"},
+        {0.5F, VT_R4, "WERT 0.5"},
+        {true, VT_BOOL, "WERT 1.0"},
+        {false, VT_BOOL, "WERT 0.0"}};
+    for (const auto& [value, tag, line] : cases) {
         DCMTextstring block;
         block.SetUnit(L" ");
         EXPECT_EQ(block.SetValue(value), S_OK);
-        EXPECT_EQ(block.GetValueType(), value.vt);
+        EXPECT_EQ(block.GetValueType(), tag);
         EXPECT_EQ(Written(block),
                   "TEXTSTRING \n    LANGNAME \"\"\n    EINHEIT_W \"\"\n    " + line + "\nEND\n\n");
         EXPECT_EQ(block.GetUnit(), L"") << "written, a blank is none";
@@ -96,11 +77,7 @@ TEST(Festwert, GivesAndTakesCopiesOfItsValue)
     CComVariant text(L"text");
     EXPECT_EQ(block.SetValue(text), S_OK);
     text.bstrVal[0] = L'n';
-    const DCMFestwert copy(block);
-    block = *&block;
     EXPECT_EQ(ValueOf(block), "'text'");
-    EXPECT_EQ(block.SetValue(CComVariant(3)), S_OK);
-    EXPECT_EQ(ValueOf(copy), "'text'");
     VARIANT bad = Tagged(99);
     bad.lVal = 1;
     EXPECT_EQ(block.GetValue(&bad), DISP_E_BADVARTYPE);
@@ -108,24 +85,21 @@ TEST(Festwert, GivesAndTakesCopiesOfItsValue)
     EXPECT_EQ(block.GetValueType(), VT_ERROR);
 }
 
-TEST(Festwerteblock, WritesLinesOfFiveOrRows)
+TEST(Festwerteblock, WritesWhatTheHostAdds)
 {
-    const std::string line = "    WERT 0.10000000000000001    10000000000000000.0    "
-                             "0.66666666666666663    1.#INF   \n";
-    const std::tuple<int, int, std::string> numbers[] = {
-        {3, 2, "3 @ 2\n    WERT 0.1    1e+016    0.666666666666667   \n    WERT 1.#INF   \n"},
-        {4, 9, "4 @ 9\n    WERT 0.1    1e+016    0.666666666666667    1.#INF   \n"},
-        {0, 3, "0 @ 3\n" + line},
-        {2, 0, "4\n" + line},
-        {2, -1, "2 @ -1\n" + line}};
-    for (const auto& [x, y, text] : numbers)
-        EXPECT_EQ(Lines({0.1, 1e16, 2.0 / 3, std::numeric_limits<double>::infinity()}, x, y),
-                  "FESTWERTEBLOCK  " + text);
-    const std::tuple<int, int, std::string> texts[] = {
-        {0, 0, "4\n    TEXT \"a\"    \"b..c\t\"    \"d\"e\"    \"\"   \n"},
-        {3, 1, "3 @ 1\n    TEXT \"a\"    \"b..c\t\"    \"d\"e\"   \n    TEXT \"\"   \n"}};
-    for (const auto& [x, y, text] : texts)
-        EXPECT_EQ(Lines({L"a", L"b\r\nc\t", L"d\"e", L""}, x, y), "FESTWERTEBLOCK  " + text);
+    DCMFestwerteblock block;
+    block.AddValue(CString(L"a\r\n\t"));
+    block.AddValue(CString());
+    const std::string head = "FESTWERTEBLOCK  2\n    LANGNAME \"\"\n";
+    EXPECT_EQ(Written(block), head + "    TEXT \"a..\t\"    \"\"   \nEND\n\n");
+    block.AddValue(0.1);
+    block.AddValue(1e16);
+    EXPECT_EQ(Written(block), head + "    WERT 0.10000000000000001    10000000000000000.0   \n"
+                                     "END\n\n");
+    block.SetXValueCount(1);
+    block.SetYValueCount(2);
+    EXPECT_EQ(Written(block), "FESTWERTEBLOCK  1 @ 2\n    LANGNAME \"\"\n    WERT 0.1   \n"
+                              "    WERT 1e+016   \nEND\n\n");
 }
 
 TEST(Festwerteblock, ReadsListsOfQuotesInLinearTime)
@@ -143,51 +117,36 @@ TEST(Festwerteblock, ReadsListsOfQuotesInLinearTime)
 
 TEST(Points, KeepOneType)
 {
-    const std::string item = "    ST/X 1.0   \n";
     const std::tuple<std::vector<CComVariant>, std::string, VARTYPE, std::string> cases[] = {
-        {{1.0, L"a", 2.0}, "1 [10] [10]", VT_ERROR, "3" + item},
-        {{L"a\r\n\t\bz\v", Tagged(VT_BSTR), L"", L"\"q"},
-         "'a\r\n\t\bz\v' - '' '\"q'",
+        {{1.0, L"a", 2.0}, "1 [10] [10]", VT_ERROR, "3\n*    ST/X 1.0   \n"},
+        {{L"a\r\n\t\bz\v", Tagged(VT_BSTR), L"\"q"},
+         "'a\r\n\t\bz\v' - '\"q'",
          VT_BSTR,
-         "4    ST_TX/X \"a....z\v\"  \"\"  \"\"  \"\"q\" \n"},
-        {{0.5F, 0.25F}, "[4]= [4]=", VT_R4, "2"},
-        {{1, 2}, "[3] [3]", VT_I4, "2"},
-        {{Tagged(13)}, "[13]", 13, "1"},
-        {{CComVariant(), 1.0, 1}, "[0] 1 [10]", VT_ERROR, "3" + item}};
+         "3\n*    ST_TX/X \"a....z\v\"  \"\"  \"\"q\" \n"},
+        {{0.5F, 0.25F}, "[4]= [4]=", VT_R4, "2\n*"},
+        {{1, 2}, "[3] [3]", VT_I4, "2\n*"},
+        {{Tagged(13)}, "[13]", 13, "1\n*"},
+        {{CComVariant(), 1.0, 1}, "[0] 1 [10]", VT_ERROR, "3\n*    ST/X 1.0   \n"}};
     for (const auto& [added, points, type, written] : cases) {
         DCMStuetzstellenverteilung block;
         for (const CComVariant& point : added)
             EXPECT_EQ(block.AddValue(point), S_OK);
         EXPECT_EQ(Points(block, &DCMStuetzstellenverteilung::GetValues), points);
         EXPECT_EQ(block.GetValueType(), type);
-        const std::string text = Replaced(Written(block), "\n*SST\n    LANGNAME \"\"\n", "");
-        EXPECT_EQ(text, "STUETZSTELLENVERTEILUNG  " + written + "END\n\n");
+        EXPECT_EQ(Written(block), "STUETZSTELLENVERTEILUNG  " +
+                                      Replaced(written, "*", "*SST\n    LANGNAME \"\"\n") +
+                                      "END\n\n");
     }
-}
-
-TEST(Points, HaveTextsOfTheirOwnInEachCopy)
-{
-    std::vector<CComVariant> points;
-    {
-        DCMKennfeld map;
-        map.AddAxisX(CComVariant(L"axis"));
-        const DCMKennfeld copy(map);
-        copy.GetAxis_X(points);
-        points[0].bstrVal[0] = L'A';
-        EXPECT_EQ(AxisX(map) + AxisX(copy), "'axis''axis'");
-    }
-    EXPECT_EQ(ShowAll(points), "'Axis'") << "it outlives the block";
 }
 
 TEST(Curve, KeepsTwoStoresAndTwoNames)
 {
     DCMGruppenkennlinie curve;
-    curve.Init(L"GRUPPENKENNLINIE K 0\n*SSTX Load\nST/X 0\nTEXT \"a\"\nEINHEIT_X x\n");
+    curve.Init(L"GRUPPENKENNLINIE K 0\n*SSTX Load\nST/X 0\nTEXT \"a\"\n");
     EXPECT_EQ(curve.GetAxisType() + curve.GetValueType(), VT_R8 + VT_BSTR);
     // The host's own numbers are no part of the block, and their keywords know only one spelling.
     for (const wchar_t* keyword : {L"ST/X", L"WERT", L"st/x", L"Wert", L"TEXT"})
         curve.AddValue(8.0, keyword);
-    EXPECT_EQ(ShowAll(curve.GetAxis()) + " " + ShowAll(curve.GetValues()), "8 8");
     curve.AddAxis(CComVariant(1.0));
     curve.AddValue(CComVariant(1.0));
     curve.SetUnit_X(L" ");
@@ -196,16 +155,16 @@ TEST(Curve, KeepsTwoStoresAndTwoNames)
     // A copy of the base's type keeps keyword, units and lists.
     DCMKennlinie copy;
     copy = curve;
-    copy.SetSharedAxisUniqueName(L"Speed");
+    curve.SetSharedAxisUniqueName(L"Speed");
     const std::string head = "GRUPPENKENNLINIE K 9\n    LANGNAME \"\"\n    EINHEIT_X \"\"\n"
                              "    EINHEIT_W \"\"\n";
     const std::string body = "    ST/X 0.0    1.0   \n    TEXT \"a\" \nEND\n\n";
-    EXPECT_EQ(Written(curve), head + body);
-    EXPECT_EQ(Written(DCMKennlinie(copy)), head + "*SSTX Speed\n" + body);
+    EXPECT_EQ(Written(curve), head + "*SSTX Speed\n" + body);
     EXPECT_EQ(curve.GetUnit_X() + curve.GetUnit_W(), L"");
     EXPECT_EQ(copy.GetUnit_X() + copy.GetUnit_W(), L"  ");
+    EXPECT_EQ(Written(copy), head + body);
     EXPECT_EQ(copy.GetStuetzstellenverteilung(), L"Load");
-    EXPECT_EQ(ShowAll(copy.GetAxis()), "8");
+    EXPECT_EQ(ShowAll(copy.GetAxis()) + " " + ShowAll(copy.GetValues()), "8 8");
 }
 
 TEST(Map, WritesWhatTheHostSets)
@@ -233,6 +192,13 @@ TEST(Map, WritesWhatTheHostSets)
                             "    WERT 2.0   \nEND\n\n");
     EXPECT_EQ(map.GetUnit_X() + map.GetUnit_Y() + map.GetUnit_W(), L"\u00B0");
     EXPECT_EQ(map.GetStuetzstellenverteilungX() + map.GetStuetzstellenverteilungY(), L"");
+    // The host's texts are its own and outlive the block.
+    std::vector<CComVariant> axis;
+    map.GetAxis_X(axis);
+    axis[0].bstrVal[0] = L'A';
+    EXPECT_EQ(Points(map, &DCMKennfeld::GetAxis_X), "'a\n\t\r\b'");
+    map = DCMFestkennfeld();
+    EXPECT_EQ(ShowAll(axis), "'A\n\t\r\b'");
 }
 
 TEST(Map, GivesItsPartsToAClassOfTheHost)
@@ -243,36 +209,14 @@ TEST(Map, GivesItsPartsToAClassOfTheHost)
                            "    ST/X 1.0    2.0   \n    ST/Y 1.0   \n    WERT 1.0    2.0   \n");
 }
 
-TEST(Map, DropsOneCharacterWhereAnOpeningQuoteStands)
-{
-    DCMKennfeld map;
-    map.Init(L"ST_TX/X \"a\" \u00FCber \"b\"\n");
-    std::vector<CComVariant> axis;
-    map.GetAxis_X(axis);
-    ASSERT_EQ(axis.size(), 3U);
-    EXPECT_EQ(CComVariant::TextOf(axis[1]), L"ber ");
-    EXPECT_EQ(CComVariant::TextOf(axis[2]), L"");
-    DCMFestwerteblock block;
-    block.Init(L"FESTWERTEBLOCK M 4 @\u00FC3\n");
-    EXPECT_EQ(block.GetXValueCount(), 4);
-    EXPECT_EQ(block.GetYValueCount(), 3);
-}
-
 TEST(Map, KeepsEveryCharacterOfTheHost)
 {
     // Characters of one to four bytes, halves of pairs, and numbers that no character has.
     CString name(L"m\u00E4\u20AC\u0131");
-    for (const std::uint32_t c : {0x1F600U, 0xD800U, 0xDFFFU, 0xFFFFU, 0x7FFFFFFFU, 0xFFFFFFFFU}) {
-        const auto wide = static_cast<wchar_t>(c);
-        name += std::wstring_view(&wide, 1);
-    }
+    for (const std::uint32_t c : {0x1F600U, 0xD800U, 0xDFFFU, 0xFFFFU, 0x7FFFFFFFU, 0xFFFFFFFFU})
+        name += CString(std::wstring(1, static_cast<wchar_t>(c)));
     DCMKennfeld map;
-    map.Init(L"KENNFELD " + name + L" 2 1\nEINHEIT_X " + name + L"\nST/X 1\u0131 \u0662\n");
+    map.Init(L"KENNFELD " + name + L" 2 1\nEINHEIT_X " + name + L"\n");
     EXPECT_EQ(map.GetName(), name);
     EXPECT_EQ(map.GetUnit_X(), name);
-    std::vector<CComVariant> axis;
-    map.GetAxis_X(axis);
-    ASSERT_EQ(axis.size(), 2U);
-    EXPECT_EQ(axis[0].dblVal, 1);
-    EXPECT_EQ(axis[1].dblVal, 0);
 }
