@@ -50,25 +50,24 @@ bool IsSettled(const DCMFestwerteblock& block)
 /// Points of a second type are counted but not written.
 bool IsSettled(const DCMStuetzstellenverteilung& block)
 {
-    std::vector<CComVariant> values;
-    Require(block.GetValues(values) == S_OK, "GetValues");
+    Require(test::Points(block, &DCMStuetzstellenverteilung::GetValues) != "failed", "GetValues");
     return block.GetValueType() != VT_ERROR;
 }
 
 bool IsSettled(const DCMKennlinie& block)
 {
-    std::vector<CComVariant> points;
-    Require(block.GetAxis(points) == S_OK && block.GetValues(points) == S_OK, "GetValues");
+    for (const auto get : {test::PointsOfCurve(&DCMKennlinie::GetAxis),
+                           test::PointsOfCurve(&DCMKennlinie::GetValues)})
+        Require(test::Points(block, get) != "failed", "GetValues");
     return true;
 }
 
 /// Points of a second type move the rows. Without a name, a count is taken for it.
 bool IsSettled(const DCMKennfeld& block)
 {
-    std::vector<CComVariant> points;
-    Require(block.GetAxis_X(points) == S_OK && block.GetAxis_Y(points) == S_OK &&
-                block.GetValues(points) == S_OK,
-            "GetValues");
+    for (const auto get :
+         {&DCMKennfeld::GetAxis_X, &DCMKennfeld::GetAxis_Y, &DCMKennfeld::GetValues})
+        Require(test::Points(block, get) != "failed", "GetValues");
     return !block.GetName().IsEmpty() && block.GetAxis_XType() != VT_ERROR &&
            block.GetAxis_YType() != VT_ERROR && block.GetValueType() != VT_ERROR;
 }

@@ -68,7 +68,6 @@ TEST(TextFile, OpensAnewWithOrWithoutSuccess)
     EXPECT_FALSE(static_cast<CFile&>(file).Open(folder / L"missing", kRead));
     EXPECT_EQ(Lines(file), "");
     EXPECT_THROW(file.WriteText(L"a"), CFileException);
-    EXPECT_THROW(PravFile(folder / L"missing", kRead), CFileException);
 }
 
 TEST(TextFile, ConvertsLongTextWhole)

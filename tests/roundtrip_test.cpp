@@ -7,17 +7,6 @@ using namespace test;
 
 namespace {
 
-/// A document made of copies of another's blocks, added kind by kind.
-DCMConverter Rebuilt(const DCMConverter& document)
-{
-    DCMConverter copy;
-    ForEachKind([&](const char*, auto get, auto add) {
-        for (const auto& block : (document.*get)())
-            EXPECT_EQ((copy.*add)(block), S_OK);
-    });
-    return copy;
-}
-
 const CString kAllKinds(DCM_TEST_DATA "/all_kinds.dcm");
 
 } // namespace
@@ -25,34 +14,29 @@ const CString kAllKinds(DCM_TEST_DATA "/all_kinds.dcm");
 TEST(RoundTrip, BringsEveryKindBack)
 {
     const std::string written = ReadBytes(CString(DCM_TEST_DATA "/all_kinds_written.dcm"));
-    DCMConverter document;
+    DCMConverter document, again;
     ASSERT_EQ(document.Import(kAllKinds), S_OK);
     EXPECT_EQ(document.GetComment(), L"Kalibrierdaten Pr\u00FCfstand 7\nerstellt von Hand\n*\n");
     EXPECT_EQ(ExportBytes(document), written);
-    DCMConverter again;
     EXPECT_EQ(ImportBytes(again, written), S_OK);
     EXPECT_EQ(ExportBytes(again), written);
-    EXPECT_EQ(document.GetGruppenkennfeld().front().GetStuetzstellenverteilungX(), L"Drehzahl");
-    EXPECT_EQ(again.GetGruppenkennfeld().front().GetStuetzstellenverteilungX(), L"");
-
-    DCMConverter assigned;
-    assigned.SetHeader(L"replaced");
-    assigned = document;
-    const DCMConverter copy(assigned);
-    assigned = DCMConverter();
-    EXPECT_EQ(ExportBytes(copy), written);
-    EXPECT_EQ(copy.GetComment(), document.GetComment());
-    EXPECT_EQ(ExportBytes(Rebuilt(document)), written);
     EXPECT_EQ(document.GetKennfeld().size() - again.GetKennfeld().size(), 1U)
         << "the map of too few values is not written";
+
+    again = document;
+    const DCMConverter copy(again);
+    again = DCMConverter();
+    EXPECT_EQ(ExportBytes(copy), written);
+    EXPECT_EQ(copy.GetComment(), document.GetComment());
 }
 
 TEST(RoundTrip, KeepsACopyOfEachBlockApart)
 {
-    DCMConverter document;
+    DCMConverter document, rebuilt;
     ASSERT_EQ(document.Import(kAllKinds), S_OK);
-    ForEachKind([&](const char*, auto get, auto) {
+    ForEachKind([&](const char*, auto get, auto add) {
         for (auto block : (document.*get)()) {
+            EXPECT_EQ((rebuilt.*add)(block), S_OK);
             decltype(block) copy(block), assigned;
             assigned = block;
             assigned = *&assigned;
@@ -63,6 +47,7 @@ TEST(RoundTrip, KeepsACopyOfEachBlockApart)
             EXPECT_EQ(Written(assigned), written);
         }
     });
+    EXPECT_EQ(ExportBytes(rebuilt), ExportBytes(document));
 }
 
 TEST(RoundTrip, SurvivesAFileCutAtEveryByte)
@@ -82,8 +67,7 @@ TEST(RoundTrip, SurvivesAFileCutAtEveryByte)
         blocks = document.GetFestwerte().size();
         // With an empty line the cut block is read too: only a WERT line without a value ends it.
         const std::string rest = whole.substr(0, size);
-        WriteBytes(closed, rest + "\n\n");
-        const bool readable = document.Import(closed) == S_OK;
+        const bool readable = ImportBytes(document, rest + "\n\n", closed) == S_OK;
         ASSERT_TRUE(readable || rest.ends_with("WERT ")) << size;
     }
     EXPECT_EQ(blocks, 0U);
