@@ -2,10 +2,7 @@
 // the kind (the letters from B on are the kinds in their order, and the format's version), the
 // others are the text in UTF-8, zeros included.
 
-#include "fuzz/kinds.h"
-#include "fuzz/memory_file.h"
 #include "fuzz/target.h"
-#include "tests/support.h"
 
 namespace {
 
@@ -39,9 +36,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         return 0;
     int kind = *data % kKinds;
     const CString text = dcm::FromUtf8({reinterpret_cast<const char*>(data + 1), size - 1});
-    ForEachKind([&](const char*, auto get, auto) {
+    test::ForEachKind([&](const char*, auto get, auto) {
         if (kind-- == 0)
-            Check<BlockOf<decltype(get)>>(text);
+            Check<test::BlockOf<decltype(get)>>(text);
     });
     if (kind == 0)
         Check<DCMKonservierungsFormat>(text);

@@ -14,9 +14,10 @@
 #include <random>
 #include <sstream>
 #include <string>
+#include <string_view>
 
-/// Numbers and number texts of every kind from a seed: those that are frequent in files, and those
-/// that are hard to round.
+/// Numbers and number texts of every kind from a seed: of few and many digits, of any size, round
+/// ones, and those that are hard to round.
 class NumberSource
 {
 public:
@@ -25,44 +26,34 @@ public:
     /// A finite number.
     double Number()
     {
-        const double numbers[] = {
-            std::bit_cast<double>(m_random()),
-            static_cast<double>(Digits()) / std::pow(10, Below(20)), // short decimals
-            std::ldexp(static_cast<double>(Digits()), -Below(64)),   // halves, quarters and on
-            Neighbour(std::ldexp(1.0, Below(2098) - 1074)),
-            Neighbour(Parse("1e" + std::to_string(Below(632) - 323))),
-            std::bit_cast<double>(m_random() >> (12 + Below(52)))}; // denormals
-        const double number = numbers[Below(6)];
-        return !std::isfinite(number) ? 0.5 : Below(2) == 0 ? -number : number;
+        const std::uint64_t bits = m_random() >> (Below(4) == 0 ? Below(64) : 0); // denormals too
+        const std::uint64_t low = (std::uint64_t{1} << Below(53)) - 1;
+        const double numbers[] = {std::bit_cast<double>(bits), std::bit_cast<double>(bits & ~low),
+                                  std::bit_cast<double>(bits | low), Parse(DecimalText()),
+                                  Parse(DecimalText())};
+        const double number = numbers[Below(5)];
+        return std::isfinite(number) ? number : 0.5;
     }
 
     /// A text that is a decimal number as a whole.
     std::string Text()
     {
-        using enum std::chars_format;
-        constexpr std::chars_format formats[] = {general, scientific, fixed};
         char buffer[1600];
-        const auto write = [&](auto... number) {
-            return std::string(buffer, std::to_chars(buffer, std::end(buffer), number...).ptr);
+        const auto write = [&](auto number, std::chars_format format, int digits) {
+            return std::string(buffer,
+                               std::to_chars(buffer, std::end(buffer), number, format, digits).ptr);
         };
         const double number = Number();
-        const int kind = Below(16);
-        if (kind < 6)
-            return write(number);
-        if (kind < 12)
-            return write(number, formats[Below(3)], Below(25));
-        std::string text;
-        if (kind == 12) { // half-way between two numbers, or a little above
-            const auto next = std::nextafter(number, std::numeric_limits<double>::max());
-            text = write((static_cast<long double>(number) + next) / 2, scientific, 780);
-            text[text.find('e') - 1] = "01"[Below(2)];
-            return text;
-        }
-        for (int i = 1 + Below(Below(4) == 0 ? 400 : 24); i > 0; --i)
-            text += "0123456789"[Below(10)];
-        text.insert(static_cast<std::size_t>(Below(static_cast<int>(text.size()))), ".");
-        text = Below(2) == 0 ? text : text + 'e' + std::to_string(Below(800) - 400);
-        return Below(2) == 0 ? text : '-' + text;
+        if (Below(4) == 0)
+            return write(number, std::chars_format::fixed, Below(25));
+        if (Below(4) != 0)
+            return DecimalText();
+        // Half-way between two numbers, or a little above.
+        const auto next = std::nextafter(number, std::numeric_limits<double>::max());
+        const auto half = (static_cast<long double>(number) + next) / 2;
+        std::string text = write(half, std::chars_format::scientific, 780);
+        text[text.find('e') - 1] = "01"[Below(2)];
+        return text;
     }
 
     /// What the standard library reads, with infinity and zero for what is out of range.
@@ -78,10 +69,16 @@ public:
 
 private:
     int Below(int limit) { return static_cast<int>(m_random() % static_cast<unsigned>(limit)); }
-    std::uint64_t Digits() { return m_random() >> (11 + Below(53)); }
-    double Neighbour(double number)
+    std::string DecimalText()
     {
-        return std::nextafter(number, Below(3) == 0 ? number : Below(2) * 2 * number);
+        const std::string_view digits = Below(2) == 0 ? "0123456789" : "0009999995";
+        std::string text = "-.";
+        for (int i = 1 + Below(Below(4) == 0 ? 400 : 24); i > 0; --i)
+            text += digits[static_cast<std::size_t>(Below(10))];
+        std::swap(text[1],
+                  text[1 + static_cast<std::size_t>(Below(static_cast<int>(text.size()) - 2))]);
+        return text.substr(static_cast<std::size_t>(Below(2))) +
+               (Below(2) == 0 ? "" : 'e' + std::to_string(Below(800) - 400));
     }
 
     std::mt19937_64 m_random;

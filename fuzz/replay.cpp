@@ -1,7 +1,6 @@
 // Runs a target over the files of a folder, without libFuzzer.
 
 #include "fuzz/target.h"
-#include "tests/support.h"
 
 int main(int, char** argv)
 {

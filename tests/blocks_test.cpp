@@ -1,4 +1,3 @@
-#include "fuzz/kinds.h"
 #include "tests/support.h"
 
 #include <gtest/gtest.h>

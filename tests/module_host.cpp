@@ -39,14 +39,12 @@ int main()
 {
     for (int i = 0; i < 2; ++i) {
         void* const library = dlopen(DCM_LIBRARY, RTLD_NOW | RTLD_LOCAL);
-        if (library == nullptr)
+        if (library == nullptr || loaded == nullptr || registrations != 1)
             return 1;
-        if (loaded == nullptr || registrations != 1)
-            return 2;
         if (dlclose(library) != 0 || dlopen(DCM_LIBRARY, RTLD_NOW | RTLD_NOLOAD) != nullptr)
-            return 3;
+            return 2;
         if (loaded != nullptr || registrations != 0)
-            return 4;
+            return 3;
     }
     return 0;
 }

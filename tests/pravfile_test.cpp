@@ -56,15 +56,15 @@ TEST(TextFile, OpensAnewWithOrWithoutSuccess)
 {
     const Folder folder;
     WriteBytes(folder / L"a", "a1\na2\n");
-    WriteBytes(folder / L"b", "b1\n");
+    WriteBytes(folder / L"b", "b1\nb2\n");
     PravFile file;
     EXPECT_EQ(Lines(file), "");
     CString line;
     EXPECT_TRUE(file.Open(folder / L"a", kRead));
     EXPECT_EQ(file.ReadLine(line), 1);
     EXPECT_TRUE(file.Open(folder / L"b", kRead));
-    EXPECT_EQ(Lines(file), "[b1]");
-    EXPECT_TRUE(file.Open(folder / L"a", kRead));
+    EXPECT_EQ(file.ReadLine(line), 1);
+    EXPECT_EQ(line, L"b1");
     EXPECT_FALSE(static_cast<CFile&>(file).Open(folder / L"missing", kRead));
     EXPECT_EQ(Lines(file), "");
     EXPECT_THROW(file.WriteText(L"a"), CFileException);
@@ -73,10 +73,9 @@ TEST(TextFile, OpensAnewWithOrWithoutSuccess)
 TEST(TextFile, ConvertsLongTextWhole)
 {
     const Folder folder;
-    const std::wstring text(1'000'000, L'\u20AC');
+    const CString text(std::wstring(1'000'000, L'\u20AC'));
     dcm::SetThreadCodePage(65001);
-    PravFile(folder / L"euros", kCreate).WriteText(CString(text) + L"\n");
-    EXPECT_EQ(ReadBytes(folder / L"euros").size(), 3 * text.size() + 2);
+    PravFile(folder / L"euros", kCreate).WriteText(text + L"\n");
     PravFile file(folder / L"euros", kRead);
     dcm::SetThreadCodePage(1252);
     CString line;

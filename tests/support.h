@@ -31,13 +31,7 @@ inline constexpr UINT kCreate = CFile::modeCreate | CFile::modeWrite;
 class Folder
 {
 public:
-    Folder()
-    {
-        std::random_device random;
-        do
-            m_path = std::filesystem::temp_directory_path() / ("dcm" + std::to_string(random()));
-        while (!std::filesystem::create_directory(m_path));
-    }
+    Folder() { std::filesystem::create_directory(m_path); }
     Folder(const Folder&) = delete;
     Folder& operator=(const Folder&) = delete;
     ~Folder()
@@ -49,7 +43,8 @@ public:
     CString operator/(const CString& name) const { return CString(m_path.wstring()) + L"/" + name; }
 
 private:
-    std::filesystem::path m_path;
+    const std::filesystem::path m_path =
+        std::filesystem::temp_directory_path() / ("dcm" + std::to_string(std::random_device()()));
 };
 
 inline std::filesystem::path PathOf(const CString& path)
@@ -103,12 +98,12 @@ inline std::vector<std::vector<std::string>> Rows(const CString& path)
     std::istringstream lines(ReadBytes(path));
     std::vector<std::vector<std::string>> rows;
     for (std::string line; std::getline(lines, line);) {
-        if (line.empty() || line[0] == '#')
-            continue;
-        rows.emplace_back();
         std::istringstream words(line);
+        std::vector<std::string> row;
         for (std::string word; words >> word;)
-            rows.back().push_back(word == "''" ? "" : Unmarked(word));
+            row.push_back(word == "''" ? "" : Unmarked(word));
+        if (!row.empty() && row[0] != "#")
+            rows.push_back(row);
     }
     return rows;
 }
@@ -145,15 +140,36 @@ inline std::string ExportBytes(const DCMConverter& document,
     return document.Export(path) == S_OK ? ReadBytes(path) : "failed";
 }
 
+/// Calls `visit` with each kind's keyword, with what gets its blocks from a document and with what
+/// adds one.
+template <class Visitor>
+void ForEachKind(Visitor visit)
+{
+    using Document = DCMConverter;
+    visit("FESTWERT", &Document::GetFestwerte, &Document::AddFestwert);
+    visit("TEXTSTRING", &Document::GetTextstring, &Document::AddTextstring);
+    visit("FESTWERTEBLOCK", &Document::GetFestwerteblock, &Document::AddFestwerteblock);
+    visit("STUETZSTELLENVERTEILUNG", &Document::GetStuetzstellenverteilung,
+          &Document::AddStuetzstellenverteilung);
+    visit("KENNLINIE", &Document::GetKennlinie, &Document::AddKennlinie);
+    visit("FESTKENNLINIE", &Document::GetFestkennlinie, &Document::AddFestkennlinie);
+    visit("GRUPPENKENNLINIE", &Document::GetGruppenkennlinie, &Document::AddGruppenkennlinie);
+    visit("KENNFELD", &Document::GetKennfeld, &Document::AddKennfeld);
+    visit("FESTKENNFELD", &Document::GetFestkennfeld, &Document::AddFestkennfeld);
+    visit("GRUPPENKENNFELD", &Document::GetGruppenkennfeld, &Document::AddGruppenkennfeld);
+}
+
+/// The class of the blocks that `Get` gets.
+template <class Get>
+using BlockOf = typename std::invoke_result_t<Get, const DCMConverter&>::value_type;
+
 inline std::string Show(const CString& text)
 {
     return "'" + dcm::ToUtf8(text) + "'";
 }
 
 /// The shortest text of a number, whatever the locale.
-template <class Number>
-requires std::is_arithmetic_v<Number>
-inline std::string Show(Number value)
+inline std::string Show(double value)
 {
     char text[32];
     return {text, std::to_chars(text, text + sizeof text, value).ptr};
