@@ -46,20 +46,14 @@ TEST(Number, AgreesWithTheStandardLibrary)
     // DCM_TEST_NUMBERS asks for more of them, as many million as one likes.
     const char* const millions = std::getenv("DCM_TEST_NUMBERS");
     NumberSource source(millions == nullptr ? 1 : std::random_device()());
+    std::string line;
     for (long i = millions == nullptr ? 20'000 : 1'000'000 * std::atol(millions); i > 0; --i) {
         ASSERT_EQ(WrongText(source.Number()), "");
         const std::string text = source.Text();
         ASSERT_EQ(WrongNumber(text, NumberSource::Parse(text)), "");
+        // One behind the other in a line, with blanks of any length.
+        if (i <= 2'000)
+            line += text + std::string(static_cast<std::size_t>(i % 700 + 1), ' ');
     }
-}
-
-TEST(Number, FollowsAnotherInALineOfAnyLength)
-{
-    NumberSource source(1);
-    std::string line;
-    for (std::size_t i = 0; i < 2'000; ++i) {
-        line += i % 100 == 7 ? std::string(600, '0') + "8" : source.Text();
-        line += std::string(i % 700 + 1, ' ');
-    }
-    EXPECT_EQ(WrongLine(line + "1", NumberSource::Parse), "");
+    EXPECT_EQ(WrongLine(line + std::string(600, '0') + "8", NumberSource::Parse), "");
 }
