@@ -77,24 +77,17 @@ bool IsSettled(const DCMConverter& document, std::vector<std::size_t>& counts)
     return settled;
 }
 
-/// A control character in front chooses another code page than the usual one.
-unsigned TakeCodePage(std::string_view& bytes)
-{
-    constexpr unsigned pages[] = {1252, 28591, 65001, 932, 500};
-    const auto choice = bytes.empty() ? 0U : static_cast<unsigned char>(bytes.front());
-    if (choice == 0 || choice >= std::size(pages))
-        return pages[0];
-    bytes.remove_prefix(1);
-    return pages[choice];
-}
-
 } // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
     const CString& file = MemoryFile();
+    // A control character in front chooses another code page than the usual one.
+    constexpr unsigned pages[] = {1252, 28591, 65001, 932, 500};
+    const std::size_t choice = size > 0 && *data < std::size(pages) ? *data : 0;
+    Require(dcm::SetThreadCodePage(pages[choice]), "the code page is known");
     std::string_view bytes(reinterpret_cast<const char*>(data), size);
-    Require(dcm::SetThreadCodePage(TakeCodePage(bytes)), "the code page is known");
+    bytes.remove_prefix(choice > 0 ? 1 : 0);
     std::ofstream(test::PathOf(file), std::ios::binary) << bytes;
 
     DCMConverter document;

@@ -4,11 +4,10 @@
 
 #include <algorithm>
 #include <bit>
-#include <charconv>
 #include <cmath>
+#include <cstddef>
 #include <cstdint>
 #include <iomanip>
-#include <iterator>
 #include <limits>
 #include <locale>
 #include <random>
@@ -38,22 +37,18 @@ public:
     /// A text that is a decimal number as a whole.
     std::string Text()
     {
-        char buffer[1600];
-        const auto write = [&](auto number, std::chars_format format, int digits) {
-            return std::string(buffer,
-                               std::to_chars(buffer, std::end(buffer), number, format, digits).ptr);
-        };
-        const double number = Number();
-        if (Below(4) == 0)
-            return write(number, std::chars_format::fixed, Below(25));
         if (Below(4) != 0)
             return DecimalText();
         // Half-way between two numbers, or a little above.
-        const auto next = std::nextafter(number, std::numeric_limits<double>::max());
-        const auto half = (static_cast<long double>(number) + next) / 2;
-        std::string text = write(half, std::chars_format::scientific, 780);
-        text[text.find('e') - 1] = "01"[Below(2)];
-        return text;
+        const double number = Number();
+        const double next = std::nextafter(number, std::numeric_limits<double>::max());
+        std::ostringstream text;
+        text.imbue(std::locale::classic());
+        text << std::scientific << std::setprecision(779)
+             << (static_cast<long double>(number) + next) / 2;
+        const std::string digits = text.str();
+        return digits.substr(0, digits.find('e')) + "01"[Below(2)] +
+               digits.substr(digits.find('e'));
     }
 
     /// What the standard library reads, with infinity and zero for what is out of range.
@@ -68,17 +63,16 @@ public:
     }
 
 private:
-    int Below(int limit) { return static_cast<int>(m_random() % static_cast<unsigned>(limit)); }
+    std::size_t Below(std::size_t limit) { return m_random() % limit; }
     std::string DecimalText()
     {
         const std::string_view digits = Below(2) == 0 ? "0123456789" : "0009999995";
         std::string text = "-.";
-        for (int i = 1 + Below(Below(4) == 0 ? 400 : 24); i > 0; --i)
-            text += digits[static_cast<std::size_t>(Below(10))];
-        std::swap(text[1],
-                  text[1 + static_cast<std::size_t>(Below(static_cast<int>(text.size()) - 2))]);
-        return text.substr(static_cast<std::size_t>(Below(2))) +
-               (Below(2) == 0 ? "" : 'e' + std::to_string(Below(800) - 400));
+        for (std::size_t i = 1 + Below(Below(4) == 0 ? 400 : 24); i > 0; --i)
+            text += digits[Below(10)];
+        std::swap(text[1], text[1 + Below(text.size() - 2)]);
+        const int exponent = static_cast<int>(Below(800)) - 400;
+        return text.substr(Below(2)) + (Below(2) == 0 ? "" : 'e' + std::to_string(exponent));
     }
 
     std::mt19937_64 m_random;

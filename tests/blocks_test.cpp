@@ -9,11 +9,6 @@ using namespace test;
 namespace {
 
 /// Those of the fields that are not empty, each behind its label.
-std::string Fields()
-{
-    return "";
-}
-
 template <class Value, class... Rest>
 std::string Fields(const char* label, const Value& value, const Rest&... rest)
 {
@@ -22,7 +17,11 @@ std::string Fields(const char* label, const Value& value, const Rest&... rest)
         text = value;
     else if (value != Value())
         text = Show(value);
-    return (text.empty() ? "" : std::string(" ") + label + " " + text) + Fields(rest...);
+    if (!text.empty())
+        text = std::string(" ") + label + " " + text;
+    if constexpr (sizeof...(rest) > 0)
+        text += Fields(rest...);
+    return text;
 }
 
 std::string Describe(const DCMFestwert& b)

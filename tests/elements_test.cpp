@@ -20,18 +20,6 @@ VARIANT Tagged(VARTYPE tag)
     return variant;
 }
 
-/// A map class of the host's own.
-struct HostMap : DCMKennfeld
-{
-    std::string Parts()
-    {
-        PravFile file;
-        EXPECT_EQ(AddValues(L"1 2", L"WERT"), S_OK);
-        return dcm::ToUtf8(ExportLangname(file) + ExportDisplayname(file) + ExportFunktion(file) +
-                           ExportValues(file));
-    }
-};
-
 } // namespace
 
 TEST(Festwert, WritesAValueOfAnyTag)
@@ -184,10 +172,20 @@ TEST(Map, WritesWhatTheHostSets)
 
 TEST(Map, GivesItsPartsToAClassOfTheHost)
 {
-    HostMap map;
-    map.Init(L"KENNFELD n 2 1\nLANGNAME l\nDISPLAYNAME d\nFUNKTION f\nST/X 1 2\nST/Y 1\n");
-    EXPECT_EQ(map.Parts(), "    LANGNAME \"l\"\n    DISPLAYNAME \"d\"\n    FUNKTION f\n"
-                           "    ST/X 1.0    2.0   \n    ST/Y 1.0   \n    WERT 1.0    2.0   \n");
+    struct HostMap : DCMKennfeld
+    {
+        CString Parts(PravFile& file) const
+        {
+            return ExportLangname(file) + ExportDisplayname(file) + ExportFunktion(file) +
+                   ExportValues(file);
+        }
+        using DCMKennfeld::AddValues;
+    } map;
+    map.Init(L"LANGNAME l\nDISPLAYNAME d\nFUNKTION f\nST/X 1\nST/Y 1\n");
+    EXPECT_EQ(map.AddValues(L"2", L"WERT"), S_OK);
+    PravFile file;
+    EXPECT_EQ(map.Parts(file), L"    LANGNAME \"l\"\n    DISPLAYNAME \"d\"\n    FUNKTION f\n"
+                               L"    ST/X 1.0   \n    ST/Y 1.0   \n    WERT 2.0   \n");
 }
 
 TEST(Map, KeepsEveryCharacterOfTheHost)

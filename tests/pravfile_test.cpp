@@ -15,7 +15,6 @@ std::string Lines(PravFile& file)
     while (file.ReadLine(line) == 1)
         lines += "[" + dcm::ToUtf8(line) + "]";
     EXPECT_EQ(line, L"");
-    EXPECT_EQ(file.ReadLine(line), 0);
     return lines;
 }
 
@@ -32,12 +31,10 @@ TEST(TextFile, HandsOutLines)
     const Folder folder;
     for (const auto& [bytes, lines] : cases) {
         WriteBytes(folder / L"in", bytes);
-        for (const UINT flags : {kRead, UINT{CFile::modeReadWrite}}) {
+        for (const UINT flags : {kRead, UINT{CFile::modeReadWrite}, UINT{CFile::modeWrite}}) {
             PravFile file(folder / L"in", flags);
-            EXPECT_EQ(Lines(file), lines);
+            EXPECT_EQ(Lines(file), flags == CFile::modeWrite ? "" : lines);
         }
-        PravFile writer(folder / L"in", CFile::modeWrite);
-        EXPECT_EQ(Lines(writer), "");
     }
 }
 
@@ -45,11 +42,10 @@ TEST(TextFile, WritesTextWithCrLf)
 {
     const Folder folder;
     PravFile file(folder / L"out", kCreate);
-    for (const std::wstring_view text :
-         {L""sv, L"a\nb\r\nc\rd\r\r\n\n\r"sv, L"|20\u00B0 \u03A9|"sv, L"\n"sv, L"e\0f"sv})
+    for (const auto text : {L""sv, L"a\nb\r\nc\rd\r\r\n\n\r"sv, L"20\u00B0"sv, L"\n"sv, L"e\0f"sv})
         EXPECT_EQ(file.WriteText(CString(text)), 1);
     file.Close();
-    EXPECT_EQ(ReadBytes(folder / L"out"), "a\r\nb\r\nc\rd\r\r\n\r\n\r|20\xB0 ?|\r\ne\0f"sv);
+    EXPECT_EQ(ReadBytes(folder / L"out"), "a\r\nb\r\nc\rd\r\r\n\r\n\r20\xB0\r\ne\0f"sv);
 }
 
 TEST(TextFile, OpensAnewWithOrWithoutSuccess)

@@ -6,11 +6,7 @@
 
 using namespace test;
 
-namespace {
-
-const CString kAllKinds(DCM_TEST_DATA "/all_kinds.dcm");
-
-} // namespace
+static const CString kAllKinds(DCM_TEST_DATA "/all_kinds.dcm");
 
 TEST(RoundTrip, BringsEveryKindBack)
 {
@@ -39,21 +35,19 @@ TEST(RoundTrip, SurvivesAFileCutAtEveryByte)
 {
     const Folder folder;
     const CString cut = folder / L"cut.dcm", closed = folder / L"closed.dcm";
-    const std::string whole = ReadBytes(kAllKinds);
-    ASSERT_GT(whole.size(), 2000U);
-    WriteBytes(cut, whole);
+    std::string rest = ReadBytes(kAllKinds);
+    WriteBytes(cut, rest);
     std::size_t blocks = 2;
-    for (std::size_t size = whole.size(); size > 0;) {
-        --size;
-        std::filesystem::resize_file(PathOf(cut), size);
+    while (!rest.empty()) {
+        rest.pop_back();
+        std::filesystem::resize_file(PathOf(cut), rest.size());
         DCMConverter document;
-        ASSERT_EQ(document.Import(cut), S_OK) << size;
-        ASSERT_LE(document.GetFestwerte().size(), blocks) << size;
+        ASSERT_EQ(document.Import(cut), S_OK) << rest;
+        ASSERT_LE(document.GetFestwerte().size(), blocks) << rest;
         blocks = document.GetFestwerte().size();
         // With an empty line the cut block is read too: only a WERT line without a value ends it.
-        const std::string rest = whole.substr(0, size);
         const bool readable = ImportBytes(document, rest + "\n\n", closed) == S_OK;
-        ASSERT_TRUE(readable || rest.ends_with("WERT ")) << size;
+        ASSERT_TRUE(readable || rest.ends_with("WERT ")) << rest;
     }
     EXPECT_EQ(blocks, 0U);
 }
@@ -79,8 +73,7 @@ TEST(Threads, UseDocumentsOfTheirOwn)
         }
     };
     {
-        const std::jthread threads[] = {std::jthread(work, 1252U), std::jthread(work, 65001U),
-                                        std::jthread(work, 28591U), std::jthread(work, 1252U)};
+        const std::jthread one(work, 1252U), two(work, 65001U), three(work, 28591U);
     }
     EXPECT_EQ(ExportBytes(shared), bytes);
 }
