@@ -73,43 +73,27 @@ int __wrap_close(int file)
 
 namespace {
 
-/// A document of all kinds, and its file.
-class FileFault : public testing::Test
+/// Runs `operation` under the fault and returns whether the fault came to pass. No file stays open
+/// or locked.
+bool Under(const Fault& wanted, const std::function<void()>& operation)
 {
-protected:
-    FileFault()
-    {
-        WriteBytes(m_path, m_bytes);
-        EXPECT_EQ(m_document.Import(m_path), S_OK);
-    }
-
-    /// Runs `operation` under the fault and returns whether the fault came to pass. No file stays
-    /// open or locked.
-    static bool Under(const Fault& wanted, const std::function<void()>& operation)
-    {
-        const auto openFiles = [] {
-            return std::distance(std::filesystem::directory_iterator("/proc/self/fd"), {});
-        };
-        const auto before = openFiles();
-        fault = wanted;
-        calls = 0;
-        operation();
-        fault = {};
-        EXPECT_EQ(openFiles(), before);
-        return calls >= wanted.number && calls > 0;
-    }
-
-    const std::string m_bytes = ReadBytes(CString(DCM_ALL_KINDS));
-    const Folder m_folder;
-    const CString m_path = m_folder / L"a.dcm";
-    DCMConverter m_document;
-};
+    const auto openFiles = [] {
+        return std::distance(std::filesystem::directory_iterator("/proc/self/fd"), {});
+    };
+    const auto before = openFiles();
+    fault = wanted;
+    calls = 0;
+    operation();
+    fault = {};
+    EXPECT_EQ(openFiles(), before);
+    return calls >= wanted.number && calls > 0;
+}
 
 constexpr HRESULT kFailed = E_UNEXPECTED;
 
 } // namespace
 
-TEST_F(FileFault, OfEachCallIsReported)
+TEST(FileFault, OfEachCallIsReported)
 {
     // What an export and an import return, and whether all is read; most calls are made by both.
     const std::tuple<Fault, HRESULT, HRESULT, bool> cases[] = {
@@ -132,20 +116,24 @@ TEST_F(FileFault, OfEachCallIsReported)
         {{"read", 1, 0, 0}, S_OK, S_OK, false},
         {{"close", 1, EIO}, kFailed, S_OK, true},
         {{"close", 1, EINTR}, S_OK, S_OK, true}};
-    const std::string none = ExportBytes(DCMConverter());
+    const std::string none = ExportBytes(DCMConverter()), bytes = ReadBytes(CString(DCM_ALL_KINDS));
+    const Folder folder;
+    const CString path = folder / L"a.dcm";
+    DCMConverter source;
+    EXPECT_EQ(ImportBytes(source, bytes, path), S_OK);
     for (const auto& [one, exported, imported, whole] : cases) {
         SCOPED_TRACE(std::string(one.call) + " " + std::to_string(one.error));
         DCMConverter document;
         HRESULT result = S_OK;
-        bool met = Under(one, [&] { result = m_document.Export(m_path); });
+        bool met = Under(one, [&] { result = source.Export(path); });
         EXPECT_EQ(result, exported);
         // An export asks for the status itself, and without an answer writes nothing.
-        EXPECT_TRUE(result != S_OK || ReadBytes(m_path) == (one.number == 3 ? "" : m_bytes));
-        EXPECT_TRUE(m_bytes.starts_with(ReadBytes(m_path))) << "what was written before stays";
-        EXPECT_EQ(ExportBytes(m_document, m_path), m_bytes);
-        met = Under(one, [&] { result = document.Import(m_path); }) || met;
+        EXPECT_TRUE(result != S_OK || ReadBytes(path) == (one.number == 3 ? "" : bytes));
+        EXPECT_TRUE(bytes.starts_with(ReadBytes(path))) << "what was written before stays";
+        EXPECT_EQ(ExportBytes(source, path), bytes);
+        met = Under(one, [&] { result = document.Import(path); }) || met;
         EXPECT_EQ(result, imported);
-        EXPECT_EQ(ExportBytes(document), whole ? m_bytes : none);
+        EXPECT_EQ(ExportBytes(document), whole ? bytes : none);
         EXPECT_TRUE(met);
     }
 }

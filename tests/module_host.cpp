@@ -6,21 +6,20 @@
 
 namespace {
 
-AFX_EXTENSION_MODULE* loaded = nullptr;
+int modules = 0;
 int registrations = 0;
 
 } // namespace
 
-BOOL AfxInitExtensionModule(AFX_EXTENSION_MODULE& state, void*) noexcept
+BOOL AfxInitExtensionModule(AFX_EXTENSION_MODULE&, void*) noexcept
 {
-    loaded = &state;
-    return TRUE;
+    return ++modules;
 }
 
 void AfxTermExtensionModule(AFX_EXTENSION_MODULE& state) noexcept
 {
     delete state.pLibrary;
-    loaded = loaded == &state ? nullptr : loaded;
+    --modules;
 }
 
 CDynLinkLibrary::CDynLinkLibrary(AFX_EXTENSION_MODULE& state) noexcept
@@ -39,11 +38,11 @@ int main()
 {
     for (int i = 0; i < 2; ++i) {
         void* const library = dlopen(DCM_LIBRARY, RTLD_NOW | RTLD_LOCAL);
-        if (library == nullptr || loaded == nullptr || registrations != 1)
+        if (library == nullptr || modules != 1 || registrations != 1)
             return 1;
         if (dlclose(library) != 0 || dlopen(DCM_LIBRARY, RTLD_NOW | RTLD_NOLOAD) != nullptr)
             return 2;
-        if (loaded != nullptr || registrations != 0)
+        if (modules != 0 || registrations != 0)
             return 3;
     }
     return 0;

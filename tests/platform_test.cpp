@@ -152,15 +152,14 @@ TEST(File, SaysWhyItCannotBeOpened)
     EXPECT_EQ(CauseOf(folder / L"missing", CFile::modeWrite), CFileException::fileNotFound);
     EXPECT_EQ(CauseOf(folder / L"", kCreate), CFileException::accessDenied);
     EXPECT_NE(CauseOf(L"", kRead), CFileException::none);
-    EXPECT_FALSE(CFile().Open(folder / L"", kRead));
-    try {
-        CFile(folder / L"missing", kRead);
-        ADD_FAILURE() << "opened";
-    } catch (const CFileException& error) {
-        EXPECT_EQ(error.m_cause, CFileException::fileNotFound);
-        EXPECT_EQ(error.m_strFileName, folder / L"missing");
-        EXPECT_TRUE(std::string(error.what()).starts_with(dcm::ToUtf8(error.m_strFileName)));
-    }
+    const CString missing = folder / L"missing";
+    EXPECT_THROW(CFile(missing, kRead), CFileException);
+    EXPECT_FALSE(CFile().Open(missing, kRead));
+    CFileException error;
+    EXPECT_FALSE(CFile().Open(missing, kRead, &error));
+    EXPECT_EQ(error.m_cause, CFileException::fileNotFound);
+    EXPECT_EQ(error.m_strFileName, missing);
+    EXPECT_TRUE(std::string(error.what()).starts_with(dcm::ToUtf8(missing)));
 }
 
 TEST(File, ReadsAndWritesWhatItsFlagsSay)
