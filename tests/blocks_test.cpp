@@ -64,7 +64,7 @@ std::string Describe(const DCMKennfeld& b)
 /// One case of the files in data/blocks/, which attributes.txt explains.
 struct Case
 {
-    std::string input, fields, written;
+    std::string title, input, fields, written;
 };
 
 template <class Block>
@@ -89,16 +89,16 @@ void Check(const Case& expected)
 }
 
 /// Checks a case for each kind that is named in front of the colon in its title.
-void CheckKinds(const std::string& title, const Case& expected)
+void CheckKinds(const Case& expected)
 {
-    SCOPED_TRACE(title);
-    const std::string kinds = " " + title.substr(0, title.find(':')) + " ";
+    SCOPED_TRACE(expected.title);
+    const std::string kinds = " " + expected.title.substr(0, expected.title.find(':')) + " ";
     bool known = false;
-    ForEachKind([&](const char* keyword, auto get, auto) {
-        if (kinds.find(" " + std::string(keyword) + " ") != kinds.npos) {
-            known = true;
-            Check<BlockOf<decltype(get)>>(expected);
-        }
+    ForEachKind([&](const std::string& keyword, auto get, auto) {
+        if (kinds.find(" " + keyword + " ") == kinds.npos)
+            return;
+        known = true;
+        Check<BlockOf<decltype(get)>>(expected);
     });
     EXPECT_TRUE(known);
 }
@@ -111,21 +111,20 @@ TEST(Blocks, ReadAndWriteAsTheirCasesSay)
     for (const std::string kinds : {"attributes", "festwert", "festwerteblock", "points"}) {
         const std::string text = ReadBytes(dcm::Widen(DCM_TEST_DATA "/blocks/" + kinds + ".txt"));
         std::istringstream lines(Unmarked(text) + "\n");
-        std::string title;
         Case now;
         for (std::string line; std::getline(lines, line);) {
+            const std::string content = line.substr(std::min<std::size_t>(line.size(), 2));
             if (line.starts_with("  ")) {
-                now.input += line.substr(2) + "\n";
+                now.input += content + "\n";
+            } else if (line.starts_with(">")) {
+                now.written += content + "\n";
             } else if (line.starts_with("=")) {
                 now.fields = line.substr(1);
-            } else if (line.starts_with(">")) {
-                now.written += line.substr(std::min<std::size_t>(line.size(), 2)) + "\n";
             } else if (!line.empty() && line[0] != '#') {
-                title = line;
-            } else if (!title.empty()) {
-                CheckKinds(title, now);
+                now.title = line;
+            } else if (!now.title.empty()) {
+                CheckKinds(now);
                 ++cases;
-                title.clear();
                 now = {};
             }
         }

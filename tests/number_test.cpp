@@ -3,8 +3,6 @@
 
 #include <gtest/gtest.h>
 
-#include <cstdlib>
-
 using namespace test;
 
 namespace {
@@ -43,17 +41,15 @@ TEST(Number, ReadsAndWritesAsItsCasesSay)
 
 TEST(Number, AgreesWithTheStandardLibrary)
 {
-    // DCM_TEST_NUMBERS asks for more of them, as many million as one likes.
-    const char* const millions = std::getenv("DCM_TEST_NUMBERS");
-    NumberSource source(millions == nullptr ? 1 : std::random_device()());
+    NumberSource source(1);
     std::string line;
-    for (long i = millions == nullptr ? 20'000 : 1'000'000 * std::atol(millions); i > 0; --i) {
+    for (std::size_t i = 0; i < 20'000; ++i) {
         ASSERT_EQ(WrongText(source.Number()), "");
         const std::string text = source.Text();
         ASSERT_EQ(WrongNumber(text, NumberSource::Parse(text)), "");
         // One behind the other in a line, with blanks of any length.
-        if (i <= 2'000)
-            line += text + std::string(static_cast<std::size_t>(i % 700 + 1), ' ');
+        if (i < 2'000)
+            line += text + std::string(i % 700 + 1, ' ');
     }
     EXPECT_EQ(WrongLine(line + std::string(600, '0') + "8", NumberSource::Parse), "");
 }

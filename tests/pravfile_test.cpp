@@ -52,15 +52,14 @@ TEST(TextFile, OpensAnewWithOrWithoutSuccess)
 {
     const Folder folder;
     WriteBytes(folder / L"a", "a1\na2\n");
-    WriteBytes(folder / L"b", "b1\nb2\n");
     PravFile file;
-    EXPECT_EQ(Lines(file), "");
     CString line;
-    EXPECT_TRUE(file.Open(folder / L"a", kRead));
-    EXPECT_EQ(file.ReadLine(line), 1);
-    EXPECT_TRUE(file.Open(folder / L"b", kRead));
-    EXPECT_EQ(file.ReadLine(line), 1);
-    EXPECT_EQ(line, L"b1");
+    EXPECT_EQ(Lines(file), "");
+    for (int pass = 0; pass < 2; ++pass) {
+        EXPECT_TRUE(file.Open(folder / L"a", kRead));
+        EXPECT_EQ(file.ReadLine(line), 1);
+        EXPECT_EQ(line, L"a1");
+    }
     EXPECT_FALSE(static_cast<CFile&>(file).Open(folder / L"missing", kRead));
     EXPECT_EQ(Lines(file), "");
     EXPECT_THROW(file.WriteText(L"a"), CFileException);
