@@ -31,10 +31,9 @@ void Check(const CString& text)
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
-    constexpr int kKinds = 11;
     if (size == 0)
         return 0;
-    int kind = *data % kKinds;
+    int kind = *data % 11;
     const CString text = dcm::FromUtf8({reinterpret_cast<const char*>(data + 1), size - 1});
     test::ForEachKind([&](const char*, auto get, auto) {
         if (kind-- == 0)

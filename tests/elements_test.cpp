@@ -38,8 +38,7 @@ TEST(Festwert, WritesAValueOfAnyTag)
         {-(std::int64_t{1} << 40), VT_I8, "WERT -1099511627776.0"},
         {~std::uint64_t{0}, VT_UI8, "WERT 1.8446744073709552e+019"},
         {0.5F, VT_R4, "WERT 0.5"},
-        {true, VT_BOOL, "WERT 1.0"},
-        {false, VT_BOOL, "WERT 0.0"}};
+        {true, VT_BOOL, "WERT 1.0"}};
     for (const auto& [value, tag, line] : cases) {
         DCMTextstring block;
         block.SetUnit(L" ");
@@ -49,7 +48,6 @@ TEST(Festwert, WritesAValueOfAnyTag)
         EXPECT_EQ(block.GetValueType(), tag);
         EXPECT_EQ(Written(block),
                   "TEXTSTRING \n    LANGNAME \"\"\n    EINHEIT_W \"\"\n    " + line + "\nEND\n\n");
-        EXPECT_EQ(block.GetUnit(), L"") << "written, a blank is none";
     }
 }
 
@@ -147,7 +145,6 @@ TEST(Map, WritesWhatTheHostSets)
                             "    EINHEIT_Y \"\xB0\"\n    EINHEIT_W \"\"\n*SSTX A\n*SSTY B\n"
                             "    ST_TX/X \"a....\" \n    ST/Y 1.0   \n    WERT 1.0   \n"
                             "    ST/Y 2.0   \n    WERT 2.0   \nEND\n\n");
-    EXPECT_EQ(map.GetUnit_X() + map.GetUnit_W() + map.GetStuetzstellenverteilungX(), L"");
 }
 
 TEST(Map, GivesItsPartsToAClassOfTheHost)
