@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <bit>
+#include <charconv>
 #include <cmath>
 #include <cstddef>
 #include <cstdint>
@@ -14,6 +15,7 @@
 #include <sstream>
 #include <string>
 #include <string_view>
+#include <system_error>
 
 /// Numbers and number texts of every kind from a seed: of few and many digits, of any size, round
 /// ones, and those that are hard to round.
@@ -54,6 +56,8 @@ public:
     static double Parse(const std::string& text)
     {
         double value = 0;
+        if (std::from_chars(text.data(), text.data() + text.size(), value).ec == std::errc())
+            return value;
         std::istringstream stream(text);
         stream.imbue(std::locale::classic());
         if (!(stream >> value)) // Too large: the largest number, with its sign.
@@ -121,11 +125,10 @@ inline std::string WrongNumber(const std::string& token, double expected)
     return wrong;
 }
 
-/// What is wrong with the text of a number by the standard library's measure; empty if nothing is.
+/// What is wrong with the text of a finite number by the standard library's measure; empty if
+/// nothing is.
 inline std::string WrongText(double number)
 {
-    if (!std::isfinite(number))
-        return Text(number, dcm::kFullDigits).find("1.#") < 3 ? "" : "no name";
     for (const int digits : {dcm::kFullDigits, dcm::kShortDigits}) {
         std::ostringstream stream;
         stream.imbue(std::locale::classic());

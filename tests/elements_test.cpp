@@ -84,7 +84,6 @@ TEST(Points, KeepOneType)
          VT_BSTR,
          "3\n*    ST_TX/X \"a....z\v\"  \"\"  \"\"q\" \n"},
         {{0.5F, 0.25F}, "[4]= [4]=", VT_R4, "2\n*"},
-        {{Tagged(13)}, "[13]", 13, "1\n*"},
         {{CComVariant(), 1.0, 1}, "[0] 1 [10]", VT_ERROR, "3\n*    ST/X 1.0   \n"}};
     for (const auto& [added, points, type, written] : cases) {
         DCMStuetzstellenverteilung block;

@@ -141,9 +141,8 @@ TEST(FileFault, OfEachCallIsReported)
 TEST(LinuxFile, RefusesPipesAndWhatItMayNotOpen)
 {
     const Folder folder;
-    const CString pipe = folder / L"pipe", loop = folder / L"loop", closed = folder / L"closed";
+    const CString pipe = folder / L"pipe", closed = folder / L"closed";
     ASSERT_EQ(mkfifo(PathOf(pipe).c_str(), 0600), 0);
-    std::filesystem::create_symlink(PathOf(loop), PathOf(loop));
     WriteBytes(closed, "FESTWERT a\n\n");
     std::filesystem::permissions(PathOf(closed), std::filesystem::perms::none);
     const int reader = open(PathOf(pipe).c_str(), O_RDONLY | O_NONBLOCK);
@@ -152,7 +151,6 @@ TEST(LinuxFile, RefusesPipesAndWhatItMayNotOpen)
     for (const UINT flags : {kRead, kCreate}) {
         EXPECT_EQ(CauseOf(pipe, flags), CFileException::accessDenied);
         ASSERT_EQ(user == 0 ? seteuid(65534) : 0, 0);
-        EXPECT_EQ(CauseOf(loop, flags), CFileException::badPath);
         EXPECT_EQ(CauseOf(closed, flags), CFileException::accessDenied);
         ASSERT_EQ(seteuid(user), 0);
     }

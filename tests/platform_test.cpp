@@ -88,6 +88,8 @@ TEST(CodePages, ConvertAsTheirCasesSay)
     EXPECT_GT(rows.size(), 20U);
     for (const auto& row : rows) {
         SCOPED_TRACE(testing::PrintToString(row));
+        if (row[0] == "linux" && std::filesystem::path::preferred_separator != '/')
+            continue;
         EXPECT_TRUE(dcm::SetThreadCodePage(static_cast<unsigned>(std::stoul(row[1]))));
         std::string bytes;
         for (std::size_t i = 0; i < row[3].size(); i += 2)
