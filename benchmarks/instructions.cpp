@@ -6,6 +6,7 @@
 #include "benchmarks/temporary_folder.h"
 #include "dcm/elements/number.h"
 #include "dcm/library/dcm.h"
+#include "dcm/platform/codepage.h"
 
 #include <valgrind/callgrind.h>
 
@@ -48,10 +49,12 @@ void ReadTokens(const std::vector<double>& numbers)
         line.append(line.empty() ? 0 : 2, L' ');
         line.append(text.data(), dcm::WriteNumber(number, 17, text.data()));
     }
+    const std::size_t size = line.size();
+    line.append(dcm::kReadAhead, ' ');
     Counted([&] {
-        dcm::NumberReader reader(line);
-        double number = 0;
-        while (reader.Next(number)) {
+        dcm::NumberReader reader({line.data(), size});
+        std::array<double, dcm::kNumbersAtOnce> values;
+        while (reader.Next(values) == values.size()) {
         }
     });
 }

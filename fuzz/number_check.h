@@ -1,8 +1,10 @@
 #pragma once
 
 #include "dcm/elements/number.h"
+#include "dcm/platform/codepage.h"
 
 #include <algorithm>
+#include <array>
 #include <bit>
 #include <charconv>
 #include <cmath>
@@ -91,27 +93,31 @@ inline std::string Text(double number, int digits)
     return {static_cast<const wchar_t*>(text.data()), end};
 }
 
-/// What is wrong with how the numbers of a line are read, each alone and behind the one before;
-/// empty if nothing is. `expected` tells the number of a token.
+/// What is wrong with how the numbers of a line are read, each alone and among the others; empty if
+/// nothing is. `expected` tells the number of a token.
 template <class Expected>
 std::string WrongLine(const std::string& line, Expected expected)
 {
-    dcm::NumberReader numbers(line);
-    bool more = true;
-    for (std::size_t start = 0; more;) {
-        const std::size_t blank = std::min(line.find(' ', start), line.size());
+    const std::string text = line + "5.5e5 .5"; // What is behind the line must not count.
+    static_assert(dcm::kReadAhead == 8);
+    dcm::NumberReader numbers({text.data(), line.size()});
+    std::array<double, dcm::kNumbersAtOnce> values;
+    std::size_t left = 0;
+    std::size_t count = 0;
+    for (std::size_t start = 0, blank = 0; !line.empty() && blank < line.size(); --left) {
+        if (left == 0)
+            left = count = numbers.Next(values);
+        if (left == 0)
+            return "no number for" + line.substr(start);
+        blank = std::min(line.find(' ', start), line.size());
         const std::string token = line.substr(start, blank - start);
         const double right = expected(token);
-        double taken = 1;
-        more = numbers.Next(taken);
-        for (const double number : {taken, dcm::ReadNumber(token)})
+        for (const double number : {values[count - left], dcm::ReadNumber(token)})
             if (std::bit_cast<std::uint64_t>(number) != std::bit_cast<std::uint64_t>(right))
                 return token + " is " + std::to_string(number);
         start = std::min(line.find_first_not_of(" \t\n\v\f\r", blank), line.size());
-        if (more != (blank < line.size()) || numbers.Rest().size() != line.size() - start)
-            return token + " is not followed by" + line.substr(start);
     }
-    return {};
+    return left + numbers.Next(values) == 0 ? "" : "a number more than tokens";
 }
 
 /// What is wrong with how `token` is read in lines where it is the first or only one.

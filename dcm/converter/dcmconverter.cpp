@@ -14,7 +14,7 @@
 struct DCMConverter::BlockKind
 {
     std::wstring_view keyword;
-    HRESULT (DCMConverter::*insert)(dcm::FileTextView block);
+    HRESULT (DCMConverter::*insert)(const dcm::FileBlock& block);
     HRESULT (DCMConverter::*write)(PravFile& file) const;
 };
 
@@ -60,22 +60,25 @@ HRESULT DCMConverter::Import(const CString& strPath)
         PravFile file(strPath, CFile::modeRead);
         m_bBlockSeen = 0;
         HRESULT result = S_OK;
-        dcm::FileTextView block;
-        while (file.ReadBlock(block))
-            result = AnalyzeToken(block);
+        while (file.ReadBlock())
+            result = AnalyzeToken(file.Block());
         return result;
     } catch (...) {
         return E_UNEXPECTED;
     }
 }
 
-/// Takes what is in front of the first blank, wherever that stands, as the keyword of the block.
-HRESULT DCMConverter::AnalyzeToken(dcm::FileTextView block)
+/// Takes what is in front of the first blank as the keyword of the block. No keyword goes beyond
+/// the first line.
+HRESULT DCMConverter::AnalyzeToken(const dcm::FileBlock& block)
 {
-    const std::size_t blank = block.bytes.find(' ');
-    if (blank == block.bytes.npos)
+    if (block.LineCount() == 0)
         return S_OK;
-    const std::string_view keyword = block.bytes.substr(0, blank);
+    const std::string_view line = block.Line(0).bytes;
+    const std::size_t blank = line.find(' ');
+    if (blank == line.npos)
+        return S_OK;
+    const std::string_view keyword = line.substr(0, blank);
     const auto* const kind =
         std::find_if(std::begin(kBlockKinds), std::end(kBlockKinds),
                      [&](const BlockKind& k) { return dcm::EqualsNoCase(keyword, k.keyword); });
@@ -93,30 +96,33 @@ HRESULT DCMConverter::AnalyzeToken(dcm::FileTextView block)
 }
 
 /// Removes the marks in one pass, so that a mark which forms anew stays.
-HRESULT DCMConverter::InsertKommentar(dcm::FileTextView block)
+HRESULT DCMConverter::InsertKommentar(const dcm::FileBlock& block)
 {
     CString comment;
-    std::string_view rest = block.bytes;
-    for (;;) {
-        const std::size_t mark = rest.find(kCommentMark);
-        dcm::AppendWide(comment, {rest.substr(0, mark), block.encoding});
-        if (mark == rest.npos)
-            break;
-        rest.remove_prefix(mark + kCommentMark.size());
+    for (std::size_t i = 0; i < block.LineCount(); ++i) {
+        const auto [bytes, file] = block.Line(i);
+        std::string_view rest = bytes;
+        std::size_t mark = 0;
+        while ((mark = rest.find(kCommentMark)) != rest.npos) {
+            dcm::AppendWide(comment, rest.substr(0, mark), file->encoding);
+            rest.remove_prefix(mark + kCommentMark.size());
+        }
+        dcm::AppendWide(comment, rest, file->encoding);
+        comment.Append(L"\n");
     }
     m_strComment = std::move(comment);
     return S_OK;
 }
 
 /// The version that a file declares changes nothing in the document.
-HRESULT DCMConverter::InsertKonservierungsFormat(dcm::FileTextView)
+HRESULT DCMConverter::InsertKonservierungsFormat(const dcm::FileBlock&)
 {
     return S_OK;
 }
 
 /// Parses a new block and stores it unless the parser rejects it.
 template <class Block>
-HRESULT DCMConverter::InsertBlock(std::list<Block>& blocks, dcm::FileTextView block)
+HRESULT DCMConverter::InsertBlock(std::list<Block>& blocks, const dcm::FileBlock& block)
 {
     std::list<Block> fresh(1);
     const HRESULT result = fresh.front().ReadBlock(block);
@@ -125,52 +131,52 @@ HRESULT DCMConverter::InsertBlock(std::list<Block>& blocks, dcm::FileTextView bl
     return result;
 }
 
-HRESULT DCMConverter::InsertFestwert(dcm::FileTextView block)
+HRESULT DCMConverter::InsertFestwert(const dcm::FileBlock& block)
 {
     return InsertBlock(m_listFestwerte, block);
 }
 
-HRESULT DCMConverter::InsertFestwerteBlock(dcm::FileTextView block)
+HRESULT DCMConverter::InsertFestwerteBlock(const dcm::FileBlock& block)
 {
     return InsertBlock(m_listFestwerteblock, block);
 }
 
-HRESULT DCMConverter::InsertStuetzstellenverteilung(dcm::FileTextView block)
+HRESULT DCMConverter::InsertStuetzstellenverteilung(const dcm::FileBlock& block)
 {
     return InsertBlock(m_listStuetzstellenverteilung, block);
 }
 
-HRESULT DCMConverter::InsertKennlinie(dcm::FileTextView block)
+HRESULT DCMConverter::InsertKennlinie(const dcm::FileBlock& block)
 {
     return InsertBlock(m_listKennlinie, block);
 }
 
-HRESULT DCMConverter::InsertFestKennlinie(dcm::FileTextView block)
+HRESULT DCMConverter::InsertFestKennlinie(const dcm::FileBlock& block)
 {
     return InsertBlock(m_listFestkennlinie, block);
 }
 
-HRESULT DCMConverter::InsertGruppenKennlinie(dcm::FileTextView block)
+HRESULT DCMConverter::InsertGruppenKennlinie(const dcm::FileBlock& block)
 {
     return InsertBlock(m_listGruppenkennlinie, block);
 }
 
-HRESULT DCMConverter::InsertKennfeld(dcm::FileTextView block)
+HRESULT DCMConverter::InsertKennfeld(const dcm::FileBlock& block)
 {
     return InsertBlock(m_listKennfeld, block);
 }
 
-HRESULT DCMConverter::InsertFestKennfeld(dcm::FileTextView block)
+HRESULT DCMConverter::InsertFestKennfeld(const dcm::FileBlock& block)
 {
     return InsertBlock(m_listFestkennfeld, block);
 }
 
-HRESULT DCMConverter::InsertGruppenKennfeld(dcm::FileTextView block)
+HRESULT DCMConverter::InsertGruppenKennfeld(const dcm::FileBlock& block)
 {
     return InsertBlock(m_listGruppenkennfeld, block);
 }
 
-HRESULT DCMConverter::InsertTextstring(dcm::FileTextView block)
+HRESULT DCMConverter::InsertTextstring(const dcm::FileBlock& block)
 {
     return InsertBlock(m_listTextstring, block);
 }

@@ -87,19 +87,19 @@ private:
     struct BlockKind;
     static const BlockKind kBlockKinds[];
 
-    HRESULT AnalyzeToken(dcm::FileTextView block);
-    HRESULT InsertKommentar(dcm::FileTextView block);
-    HRESULT InsertKonservierungsFormat(dcm::FileTextView block);
-    HRESULT InsertFestwert(dcm::FileTextView block);
-    HRESULT InsertFestwerteBlock(dcm::FileTextView block);
-    HRESULT InsertStuetzstellenverteilung(dcm::FileTextView block);
-    HRESULT InsertKennlinie(dcm::FileTextView block);
-    HRESULT InsertFestKennlinie(dcm::FileTextView block);
-    HRESULT InsertGruppenKennlinie(dcm::FileTextView block);
-    HRESULT InsertKennfeld(dcm::FileTextView block);
-    HRESULT InsertFestKennfeld(dcm::FileTextView block);
-    HRESULT InsertGruppenKennfeld(dcm::FileTextView block);
-    HRESULT InsertTextstring(dcm::FileTextView block);
+    HRESULT AnalyzeToken(const dcm::FileBlock& block);
+    HRESULT InsertKommentar(const dcm::FileBlock& block);
+    HRESULT InsertKonservierungsFormat(const dcm::FileBlock& block);
+    HRESULT InsertFestwert(const dcm::FileBlock& block);
+    HRESULT InsertFestwerteBlock(const dcm::FileBlock& block);
+    HRESULT InsertStuetzstellenverteilung(const dcm::FileBlock& block);
+    HRESULT InsertKennlinie(const dcm::FileBlock& block);
+    HRESULT InsertFestKennlinie(const dcm::FileBlock& block);
+    HRESULT InsertGruppenKennlinie(const dcm::FileBlock& block);
+    HRESULT InsertKennfeld(const dcm::FileBlock& block);
+    HRESULT InsertFestKennfeld(const dcm::FileBlock& block);
+    HRESULT InsertGruppenKennfeld(const dcm::FileBlock& block);
+    HRESULT InsertTextstring(const dcm::FileBlock& block);
 
     HRESULT WriteHeader(PravFile& file) const;
     HRESULT WriteFormat(PravFile& file) const;
@@ -115,7 +115,7 @@ private:
     HRESULT WriteTextstring(PravFile& file) const;
 
     template <class Block>
-    static HRESULT InsertBlock(std::list<Block>& blocks, dcm::FileTextView block);
+    static HRESULT InsertBlock(std::list<Block>& blocks, const dcm::FileBlock& block);
     template <class Block>
     static HRESULT WriteBlocks(const std::list<Block>& blocks, PravFile& file);
 

@@ -40,11 +40,11 @@ bool DCMBaseType::ReadAttribute(std::string_view keyword, dcm::FileTextView valu
                                 dcm::FileTextView function)
 {
     if (dcm::EqualsNoCase(keyword, dcm::keyword::kLangname))
-        m_strLangname = value.Wide();
+        m_strLangname = value.SharedWide();
     else if (dcm::EqualsNoCase(keyword, dcm::keyword::kDisplayname))
-        m_strDisplayname = value.Wide();
+        m_strDisplayname = value.SharedWide();
     else if (dcm::EqualsNoCase(keyword, dcm::keyword::kFunktion))
-        m_strFunction = function.Wide();
+        m_strFunction = function.SharedWide();
     else
         return false;
     return true;

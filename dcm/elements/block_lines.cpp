@@ -1,32 +1,44 @@
 #include "dcm/elements/block_lines.h"
 
 #include <algorithm>
+#include <bit>
+#include <cstdint>
 
 namespace dcm {
 
-BlockLines::BlockLines(FileTextView block) : m_left(block)
+namespace {
+
+/// The next character up to a blank, or `end`: there a word ends.
+const char* SkipWord(const char* at, const char* end)
 {
-    if (block.bytes.starts_with('\n'))
-        m_left.bytes = {};
+    for (; at < end; at += 8) {
+        // Only bytes below 0x21 borrow from their highest bit; where one does, those behind it may
+        // be taken for such bytes too.
+        const std::uint64_t text = EightCharacters(at);
+        const std::uint64_t low = (text - EightTimes(0x21)) & ~text & EightTimes(0x80);
+        if (low != 0)
+            return std::min(at + std::countr_zero(low) / 8, end);
+    }
+    return end;
 }
+
+} // namespace
 
 bool BlockLines::Next(BlockLine& line)
 {
-    auto& [left, encoding] = m_left;
-    for (;;) {
-        const std::size_t end = left.find('\n');
-        if (end == left.npos)
-            return false;
-        const std::string_view text = TrimLeft(left.substr(0, end), IsWhite);
-        left.remove_prefix(end + 1);
-        const char* const last = text.data() + text.size();
-        // Keywords are short: the blank behind one is near.
-        const char* const blank = std::find(text.data(), last, ' ');
-        if (blank != last) {
-            line = {{text.data(), blank}, {{blank + 1, last}, encoding}};
+    while (m_next < m_block.LineCount()) {
+        const auto [bytes, file] = m_block.Line(m_next++);
+        const char* const end = bytes.data() + bytes.size();
+        const char* const start = SkipWhite(bytes.data(), end);
+        const char* blank = SkipWord(start, end);
+        while (blank != end && *blank != ' ')
+            blank = SkipWord(blank + 1, end);
+        if (blank != end) {
+            line = {{start, blank}, {{blank + 1, end}, file}};
             return true;
         }
     }
+    return false;
 }
 
 FileTextView TakeName(FileTextView& rest)
@@ -35,10 +47,10 @@ FileTextView TakeName(FileTextView& rest)
     const std::size_t blank = text.find(' ');
     if (blank == text.npos) {
         rest = TrimWhite(rest);
-        return {{}, rest.encoding};
+        return {{}, rest.file};
     }
     rest.bytes = TrimWhite(text.substr(blank));
-    return {TrimRight(text.substr(0, blank), IsWhite), rest.encoding};
+    return {TrimRight(text.substr(0, blank), IsWhite), rest.file};
 }
 
 } // namespace dcm

@@ -2,6 +2,7 @@
 
 #include "dcm/platform/codepage.h"
 #include "dcm/platform/text.h"
+#include "dcm/textfile/fileblock.h"
 
 #include <string_view>
 
@@ -10,22 +11,22 @@ namespace dcm {
 
 inline FileTextView TrimWhite(FileTextView text)
 {
-    return {TrimWhite(text.bytes), text.encoding};
+    return {TrimWhite(text.bytes), text.file};
 }
 
 inline FileTextView TrimBlanks(FileTextView text)
 {
-    return {TrimBlanks(text.bytes), text.encoding};
+    return {TrimBlanks(text.bytes), text.file};
 }
 
 inline FileTextView TrimQuotes(FileTextView text)
 {
-    return {TrimQuotes(text.bytes), text.encoding};
+    return {TrimQuotes(text.bytes), text.file};
 }
 
 inline FileTextView TrimBlanksAndQuotes(FileTextView text)
 {
-    return {TrimBlanksAndQuotes(text.bytes), text.encoding};
+    return {TrimBlanksAndQuotes(text.bytes), text.file};
 }
 
 /// One line of a block: its keyword, and all that follows the first blank behind it.
@@ -38,18 +39,19 @@ struct BlockLine
 };
 
 /// Walks over the lines of a block that have a keyword and a blank. White space in front of a line
-/// does not count, text behind the last line feed is not read, and a block that begins with a line
-/// feed has no lines.
+/// does not count.
 class BlockLines
 {
 public:
-    explicit BlockLines(FileTextView block);
+    /// The block must outlive this object.
+    explicit BlockLines(const FileBlock& block) : m_block(block) {}
 
     /// Takes the next such line. False at the end.
     bool Next(BlockLine& line);
 
 private:
-    FileTextView m_left;
+    const FileBlock& m_block;
+    std::size_t m_next = 0;
 };
 
 /// Takes the name, the text before the first blank, off `rest`, which keeps what follows without

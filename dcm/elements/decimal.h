@@ -1,10 +1,11 @@
 #pragma once
 
+#include "dcm/platform/text.h"
+
 #include <array>
 #include <bit>
 #include <cstddef>
 #include <cstdint>
-#include <cstring>
 
 // The fast conversions between doubles, decimal digits and characters.
 //
@@ -143,24 +144,10 @@ inline bool ToDouble(Decimal decimal, double& value) noexcept
     return true;
 }
 
-/// Eight times the byte `value`.
-constexpr std::uint64_t EightTimes(unsigned char value)
+/// EightCharacters, with 0 to 9 for digits.
+inline std::uint64_t DigitBytes(const char* at)
 {
-    return value * std::uint64_t{0x0101'0101'0101'0101};
-}
-
-/// The eight characters at `at` in the bytes of a word, the first in the lowest: 0 to 9 for digits.
-inline std::uint64_t DigitBytes(const unsigned char* at)
-{
-    std::uint64_t text = 0;
-    if constexpr (std::endian::native == std::endian::little) {
-        std::memcpy(&text, at, sizeof text);
-    } else {
-        for (int i = 0; i < 8; ++i) {
-            text |= std::uint64_t{at[i]} << (8 * i);
-        }
-    }
-    return text ^ EightTimes('0');
+    return EightCharacters(at) ^ EightTimes('0');
 }
 
 /// Bits in the upper half of each byte that is not a digit, none in those that are: only 10 to 15

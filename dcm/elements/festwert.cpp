@@ -70,10 +70,10 @@ DCMFestwert::~DCMFestwert() = default;
 
 HRESULT DCMFestwert::Init(const CString& strBlock)
 {
-    return ReadBlock(dcm::FileTextOfHost(strBlock).View());
+    return ReadBlock(dcm::HostBlock(strBlock).Block());
 }
 
-HRESULT DCMFestwert::ReadBlock(dcm::FileTextView block)
+HRESULT DCMFestwert::ReadBlock(const dcm::FileBlock& block)
 {
     dcm::BlockLines lines(block);
     dcm::BlockLine line;
@@ -85,7 +85,7 @@ HRESULT DCMFestwert::ReadBlock(dcm::FileTextView block)
         else if (ReadAttribute(line.keyword, rest, rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnit = rest.Wide();
+            m_strUnit = rest.SharedWide();
         else if (line.Is(dcm::keyword::kWert))
             m_value = dcm::ReadNumber(rest.bytes);
         else if (line.Is(dcm::keyword::kText))

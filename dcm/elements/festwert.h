@@ -6,6 +6,7 @@
 #include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
+#include "dcm/textfile/fileblock.h"
 
 #include <string_view>
 
@@ -63,7 +64,7 @@ private:
     void ReadText(dcm::FileTextView text);
     void SetText(dcm::FileTextView text);
     /// Init for the text of a file.
-    HRESULT ReadBlock(dcm::FileTextView block);
+    HRESULT ReadBlock(const dcm::FileBlock& block);
     /// Composes the block in `block`, which is empty before.
     void ComposeBlock(CString& block) const;
 

@@ -9,6 +9,7 @@
 #include "dcm/textfile/pravfile.h"
 
 #include <algorithm>
+#include <array>
 #include <string>
 #include <utility>
 
@@ -58,10 +59,10 @@ DCMFestwerteblock::~DCMFestwerteblock() = default;
 
 HRESULT DCMFestwerteblock::Init(const CString& strBlock)
 {
-    return ReadBlock(dcm::FileTextOfHost(strBlock).View());
+    return ReadBlock(dcm::HostBlock(strBlock).Block());
 }
 
-HRESULT DCMFestwerteblock::ReadBlock(dcm::FileTextView block)
+HRESULT DCMFestwerteblock::ReadBlock(const dcm::FileBlock& block)
 {
     dcm::BlockLines lines(block);
     dcm::BlockLine line;
@@ -73,7 +74,7 @@ HRESULT DCMFestwerteblock::ReadBlock(dcm::FileTextView block)
         else if (ReadAttribute(line.keyword, rest, rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnit = rest.Wide();
+            m_strUnit = rest.SharedWide();
         else if (line.Is(dcm::keyword::kWert))
             AddValues(rest);
         else if (line.Is(dcm::keyword::kText))
@@ -103,11 +104,11 @@ HRESULT DCMFestwerteblock::AddValues(dcm::FileTextView rest)
     if (rest.bytes.empty())
         dcm::ThrowResult(E_INVALIDARG);
     dcm::NumberReader numbers(rest.bytes);
-    bool more = true;
-    while (more) {
-        double number = 0;
-        more = numbers.Next(number);
-        m_vecDoubleValues.push_back(number);
+    std::array<double, dcm::kNumbersAtOnce> values;
+    std::size_t count = values.size();
+    while (count == values.size()) {
+        count = numbers.Next(values);
+        m_vecDoubleValues.insert(m_vecDoubleValues.end(), values.begin(), values.begin() + count);
     }
     return S_OK;
 }
@@ -119,14 +120,14 @@ HRESULT DCMFestwerteblock::AddTexts(dcm::FileTextView rest)
     if (IsQuoted(rest.bytes))
         return AddStringValues(rest);
     const std::string quoted = '"' + std::string(rest.bytes) + '"';
-    return AddStringValues({quoted, rest.encoding});
+    return AddStringValues({quoted, rest.file});
 }
 
 HRESULT DCMFestwerteblock::AddStringValues(dcm::FileTextView line)
 {
     std::string_view rest = line.bytes;
     const auto add = [&](std::string_view text) {
-        m_listStringValues.push_back(dcm::FileTextView{text, line.encoding}.Wide());
+        m_listStringValues.push_back(dcm::FileTextView{text, line.file}.Wide());
     };
     while (!rest.empty()) {
         const std::size_t quotes = std::min(rest.find_first_not_of('"'), rest.size());

@@ -5,6 +5,7 @@
 #include "dcm/platform/automation.h"
 #include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
+#include "dcm/textfile/fileblock.h"
 
 #include <cstdint>
 #include <list>
@@ -72,7 +73,7 @@ private:
     HRESULT AddTexts(dcm::FileTextView rest);
     HRESULT AddStringValues(dcm::FileTextView line);
     /// Init for the text of a file.
-    HRESULT ReadBlock(dcm::FileTextView block);
+    HRESULT ReadBlock(const dcm::FileBlock& block);
     /// Composes the block in `block`, which is empty before.
     void ComposeBlock(CString& block) const;
     void ExportValues(CString& block) const;

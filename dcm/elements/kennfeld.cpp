@@ -25,38 +25,40 @@ DCMKennfeld::~DCMKennfeld() = default;
 
 HRESULT DCMKennfeld::Init(const CString& strBlock)
 {
-    return ReadBlock(dcm::FileTextOfHost(strBlock).View());
+    return ReadBlock(dcm::HostBlock(strBlock).Block());
 }
 
-HRESULT DCMKennfeld::ReadBlock(dcm::FileTextView block)
+HRESULT DCMKennfeld::ReadBlock(const dcm::FileBlock& block)
 {
+    const auto targets = PointTargets();
+    dcm::PointReader points(targets);
     dcm::BlockLines lines(block);
     dcm::BlockLine line;
     while (lines.Next(line)) {
         // Most lines of a file are lines of points.
-        if (TakePointLine(line.keyword, line.rest))
+        if (points.Read(line))
             continue;
         if (line.Is(m_strKeyword))
             ReadFirstLine(dcm::TrimWhite(line.rest), block);
         else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnitX = dcm::TrimBlanksAndQuotes(line.rest).Wide();
+            m_strUnitX = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
         else if (line.Is(dcm::keyword::kEinheitY))
-            m_strUnitY = dcm::TrimBlanksAndQuotes(line.rest).Wide();
+            m_strUnitY = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
         else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnitW = dcm::TrimBlanksAndQuotes(line.rest).Wide();
+            m_strUnitW = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
         else if (line.Is(dcm::keyword::kSstX))
-            m_strStuetzstellenverteilungX = dcm::TrimBlanks(line.rest).Wide();
+            m_strStuetzstellenverteilungX = dcm::TrimBlanks(line.rest).SharedWide();
         else if (line.Is(dcm::keyword::kSstY))
-            m_strStuetzstellenverteilungY = dcm::TrimBlanks(line.rest).Wide();
+            m_strStuetzstellenverteilungY = dcm::TrimBlanks(line.rest).SharedWide();
     }
     return S_OK;
 }
 
 /// The name, the count of the X axis and that of the Y axis. Where a word is missing, it is the
 /// one in front.
-void DCMKennfeld::ReadFirstLine(dcm::FileTextView rest, dcm::FileTextView block)
+void DCMKennfeld::ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block)
 {
     SetName(dcm::TakeName(rest).Wide());
     m_nAxisLengthX = dcm::ReadInteger(dcm::TakeName(rest).bytes);
@@ -68,20 +70,18 @@ void DCMKennfeld::ReadFirstLine(dcm::FileTextView rest, dcm::FileTextView block)
 
 HRESULT DCMKennfeld::AddValues(std::wstring_view rest, std::wstring_view keyword)
 {
-    const dcm::FileText points = dcm::FileTextOfHost(rest);
-    TakePointLine(dcm::FileTextOfHost(keyword).Bytes(), points.View());
+    const dcm::FileText word = dcm::FileTextOfHost(keyword);
+    const dcm::FileText text = dcm::FileTextOfHost(rest);
+    const auto targets = PointTargets();
+    dcm::PointReader(targets).Read({word.Bytes(), text.View()});
     return S_OK;
 }
 
-/// Reads a line of points or values; false for any other line.
-bool DCMKennfeld::TakePointLine(std::string_view keyword, dcm::FileTextView rest)
+std::array<dcm::PointTarget, 3> DCMKennfeld::PointTargets()
 {
-    const dcm::PointTarget targets[] = {
-        {dcm::kValues, {m_vecValues, m_vtValueType}},
-        {dcm::kAxisX, {m_vecAxisX, m_vtAxisXType}},
-        {dcm::kAxisY, {m_vecAxisY, m_vtAxisYType}},
-    };
-    return dcm::ReadPointLine(keyword, rest, targets);
+    return {{{dcm::kValues, {m_vecValues, m_vtValueType}},
+             {dcm::kAxisX, {m_vecAxisX, m_vtAxisXType}},
+             {dcm::kAxisY, {m_vecAxisY, m_vtAxisYType}}}};
 }
 
 HRESULT DCMKennfeld::Export(PravFile& file)

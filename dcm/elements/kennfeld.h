@@ -6,10 +6,16 @@
 #include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
+#include "dcm/textfile/fileblock.h"
 
+#include <array>
 #include <cstdint>
 #include <string_view>
 #include <vector>
+
+namespace dcm {
+struct PointTarget;
+} // namespace dcm
 
 /// One KENNFELD: a map of values over the points of two axes, each of the three with a unit.
 ///
@@ -104,10 +110,10 @@ protected:
 
 private:
     friend class DCMConverter;
-    void ReadFirstLine(dcm::FileTextView rest, dcm::FileTextView block);
-    bool TakePointLine(std::string_view keyword, dcm::FileTextView rest);
+    void ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block);
+    std::array<dcm::PointTarget, 3> PointTargets();
     /// Init for the text of a file.
-    HRESULT ReadBlock(dcm::FileTextView block);
+    HRESULT ReadBlock(const dcm::FileBlock& block);
     /// Composes the block in `block`, which is empty before.
     void ComposeBlock(CString& block) const;
     void AppendValues(CString& block) const;

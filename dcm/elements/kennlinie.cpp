@@ -23,50 +23,45 @@ DCMKennlinie::~DCMKennlinie() = default;
 
 HRESULT DCMKennlinie::Init(const CString& strBlock)
 {
-    return ReadBlock(dcm::FileTextOfHost(strBlock).View());
+    return ReadBlock(dcm::HostBlock(strBlock).Block());
 }
 
-HRESULT DCMKennlinie::ReadBlock(dcm::FileTextView block)
+HRESULT DCMKennlinie::ReadBlock(const dcm::FileBlock& block)
 {
+    const dcm::PointTarget targets[] = {
+        {dcm::kAxisX, {m_vecAxis, m_vtAxisType}},
+        {dcm::kValues, {m_vecValues, m_vtValueType}},
+    };
+    dcm::PointReader points(targets);
     dcm::BlockLines lines(block);
     dcm::BlockLine line;
     while (lines.Next(line)) {
         // Most lines of a file are lines of points.
-        if (AddValues(line.rest, line.keyword))
+        if (points.Read(line))
             continue;
         if (line.Is(m_strKeyword))
             ReadFirstLine(dcm::TrimWhite(line.rest), block);
         else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnitX = dcm::TrimBlanksAndQuotes(line.rest).Wide();
+            m_strUnitX = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
         else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnitW = dcm::TrimBlanksAndQuotes(line.rest).Wide();
+            m_strUnitW = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
         else if (line.Is(dcm::keyword::kStTxY))
             return E_FAIL;
         else if (line.Is(dcm::keyword::kSstX))
-            m_strStuetzstellenverteilung = dcm::TrimBlanks(line.rest).Wide();
+            m_strStuetzstellenverteilung = dcm::TrimBlanks(line.rest).SharedWide();
     }
     return S_OK;
 }
 
 /// The name and the count behind it; a line of one word is the count.
-void DCMKennlinie::ReadFirstLine(dcm::FileTextView rest, dcm::FileTextView block)
+void DCMKennlinie::ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block)
 {
     SetName(dcm::TakeName(rest).Wide());
     m_nAxisLengthX = dcm::ReadInteger(rest.bytes);
     dcm::ReservePoints(m_vecAxis, m_nAxisLengthX, block);
     dcm::ReservePoints(m_vecValues, m_nAxisLengthX, block);
-}
-
-/// Reads a line of points or values; false for any other line.
-bool DCMKennlinie::AddValues(dcm::FileTextView rest, std::string_view keyword)
-{
-    const dcm::PointTarget targets[] = {
-        {dcm::kAxisX, {m_vecAxis, m_vtAxisType}},
-        {dcm::kValues, {m_vecValues, m_vtValueType}},
-    };
-    return dcm::ReadPointLine(keyword, rest, targets);
 }
 
 HRESULT DCMKennlinie::Export(PravFile& file)

@@ -1,6 +1,7 @@
 #include "dcm/elements/number.h"
 
 #include "dcm/elements/decimal.h"
+#include "dcm/platform/codepage.h"
 #include "dcm/platform/text.h"
 
 #include <algorithm>
@@ -160,28 +161,43 @@ double ReadToken(std::string_view token) noexcept
     return ReadDecimal(token);
 }
 
+constexpr std::array<std::uint64_t, 8> kTens = {1,      10,      100,       1'000,
+                                                10'000, 100'000, 1'000'000, 10'000'000};
+
 /// Appends the digits at `at` to `number`, up to eight at a time; returns their end.
-inline const unsigned char* TakeDigits(const unsigned char* at, std::uint64_t& number)
+inline const char* TakeDigits(const char* at, std::uint64_t& number)
 {
-    constexpr std::uint64_t tens[] = {1, 10, 100, 1'000, 10'000, 100'000, 1'000'000, 10'000'000};
     for (;;) {
         const auto bytes = DigitBytes(at);
         const auto others = NotDigits(bytes);
         if (others != 0) {
             // No branch on the count, which changes from number to number.
-            const int size = std::countr_zero(others) & 56;
-            number = number * tens[size / 8] + JoinEight(bytes << 8 << (56 - size));
-            return at + size / 8;
+            const auto size = static_cast<unsigned>(std::countr_zero(others)) / 8;
+            number = number * kTens[size] + JoinEight(bytes << 8 << (56 - 8 * size));
+            return at + size;
         }
         number = number * kTenTo8 + JoinEight(bytes);
         at += 8;
     }
 }
 
-/// Takes the digits at `at` and a point among them; returns their end, or a null pointer when there
-/// is no digit. More than 19 digits overflow.
-inline const unsigned char* TakeFixed(const unsigned char* at, Decimal& decimal)
+/// Whether what was taken from `at` to `end` is at most 19 digits, zeros in front not counted.
+inline bool FitsInDecimal(const char* at, const char* end)
 {
+    constexpr std::ptrdiff_t most = 19;
+    if (end - at > most) {
+        while (*at == '0' || *at == '.') {
+            ++at;
+        }
+    }
+    return end - at <= most;
+}
+
+/// Takes the digits at `at` and a point among them; returns their end, or a null pointer when there
+/// is no digit or there are too many.
+inline const char* TakeFixed(const char* at, Decimal& decimal)
+{
+    const auto* const start = at;
     const auto bytes = DigitBytes(at);
     const auto others = NotDigits(bytes);
     if (others == 0) {
@@ -191,7 +207,7 @@ inline const unsigned char* TakeFixed(const unsigned char* at, Decimal& decimal)
             at = TakeDigits(fraction, decimal.digits);
             decimal.exponent = static_cast<int>(fraction - at);
         }
-        return at;
+        return FitsInDecimal(start, at) ? at : nullptr;
     }
     // The digits in front of the first other character, those behind it if that is the point, and
     // where they end or, after seven, the word does. All positions are in bits.
@@ -213,12 +229,12 @@ inline const unsigned char* TakeFixed(const unsigned char* at, Decimal& decimal)
     const auto* const more = at;
     at = TakeDigits(at, decimal.digits);
     decimal.exponent -= static_cast<int>(at - more);
-    return at;
+    return FitsInDecimal(start, at) ? at : nullptr;
 }
 
 /// Adds the exponent at `at`, "e" included, to `exponent` and returns its end; `at` itself when
 /// there is none of one to four digits.
-const unsigned char* TakeExponent(const unsigned char* at, int& exponent)
+const char* TakeExponent(const char* at, int& exponent)
 {
     const auto* next = at;
     if (*next != 'e' && *next != 'E') {
@@ -238,24 +254,14 @@ const unsigned char* TakeExponent(const unsigned char* at, int& exponent)
 
 /// Reads the decimal number at `at` in the forms that files are full of, and returns its end; a
 /// null pointer for all that ReadToken must see.
-inline const unsigned char* TakeDecimal(const unsigned char* at, double& value)
+inline const char* TakeDecimal(const char* at, double& value)
 {
     const std::uint64_t negative = *at == '-' ? 1 : 0;
     at += negative;
-    const auto* start = at;
     Decimal decimal;
     at = TakeFixed(at, decimal);
     if (at == nullptr) {
         return nullptr;
-    }
-    constexpr std::ptrdiff_t most = 19;
-    if (at - start > most) {
-        while (*start == '0' || *start == '.') {
-            ++start;
-        }
-        if (at - start > most) {
-            return nullptr;
-        }
     }
     if (*at != ' ') {
         at = TakeExponent(at, decimal.exponent);
@@ -338,65 +344,39 @@ double ReadDecimal(std::string_view text) noexcept
 
 double ReadNumber(std::string_view token) noexcept
 {
+    constexpr std::size_t longest = 64;
+    std::array<char, longest + kReadAhead> piece{};
+    token.copy(piece.data(), longest);
     double value = 0.0;
-    return NumberReader(token).Next(value) ? ReadToken(token) : value;
+    return TakeDecimal(piece.data(), value) == piece.data() + token.size() ? value
+                                                                            : ReadToken(token);
 }
 
-bool NumberReader::Next(double& value) noexcept
+std::size_t NumberReader::Next(std::span<double> values) noexcept
 {
-    if (m_at > m_last) {
-        Load(Rest());
+    auto to = values.begin();
+    while (m_more && to != values.end()) {
+        double& value = *to++;
+        const char* const end = TakeDecimal(m_at, value);
+        if (end == m_end) {
+            m_more = false;
+        } else if (end != nullptr && *end == ' ' && end < m_end) {
+            m_at = SkipWhite(end + 1, m_end);
+        } else {
+            value = NextOfAnyKind();
+        }
     }
-    const auto* at = TakeDecimal(m_at, value);
-    if (at == nullptr || (*at != ' ' && (at != m_end || m_last != m_end))) {
-        return NextOfAnyKind(value);
-    }
-    const bool more = *at == ' ';
-    while (*at == ' ') {
-        ++at;
-    }
-    m_at = at;
-    if (*at < ' ') {
-        SkipWhite();
-    }
-    return more;
+    return static_cast<std::size_t>(to - values.begin());
 }
 
-/// Next for tokens of every kind and length.
-bool NumberReader::NextOfAnyKind(double& value)
+/// The next number from a token of any kind and length.
+double NumberReader::NextOfAnyKind()
 {
-    const auto rest = Rest();
+    const std::string_view rest(m_at, m_end);
     const auto blank = rest.find(' ');
-    value = ReadToken(rest.substr(0, blank));
-    Skip(std::min(blank, rest.size()));
-    SkipWhite();
-    return blank != rest.npos;
-}
-
-void NumberReader::SkipWhite()
-{
-    const auto rest = Rest();
-    Skip(rest.size() - TrimLeft(rest, IsWhite).size());
-}
-
-void NumberReader::Skip(std::size_t count)
-{
-    if (count <= static_cast<std::size_t>(m_end - m_at)) {
-        m_at += count;
-    } else {
-        Load(Rest().substr(count));
-    }
-}
-
-void NumberReader::Load(std::string_view text)
-{
-    m_text = text;
-    const auto size = std::min(text.size(), kPiece);
-    text.copy(reinterpret_cast<char*>(m_piece.data()), size);
-    std::memset(m_piece.data() + size, 0, kBehind);
-    m_at = m_piece.data();
-    m_end = m_at + size;
-    m_last = size == text.size() ? m_end : m_end - kLongest;
+    m_more = blank != rest.npos;
+    m_at = m_more ? SkipWhite(m_at + blank, m_end) : m_end;
+    return ReadToken(rest.substr(0, blank));
 }
 
 std::int32_t ReadInteger(std::string_view text) noexcept

@@ -1,8 +1,8 @@
 #pragma once
 
-#include <array>
 #include <cstddef>
 #include <cstdint>
+#include <span>
 #include <string_view>
 
 namespace dcm {
@@ -30,42 +30,31 @@ double ReadDecimal(std::string_view text) noexcept;
 /// what ReadDecimal reads.
 double ReadNumber(std::string_view token) noexcept;
 
-/// Reads numbers one after the other from text in which blanks part them.
+/// As many numbers as it pays to read in one go.
+inline constexpr std::size_t kNumbersAtOnce = 16;
+
+/// Reads the numbers of a text in which blanks part them.
 class NumberReader
 {
 public:
-    explicit NumberReader(std::string_view text) noexcept { Load(text); }
-    NumberReader(const NumberReader&) = delete;
-    NumberReader& operator=(const NumberReader&) = delete;
+    /// The text must outlive the reader, and `kReadAhead` characters behind it must be there to be
+    /// read; what they are does not count.
+    explicit NumberReader(std::string_view text) noexcept
+        : m_at(text.data()), m_end(m_at + text.size()), m_more(!text.empty())
+    {}
 
-    /// Reads the token in front of the next blank (all that is left, without a blank) as ReadNumber
-    /// does, then skips that blank and the white space behind it. Returns whether a blank ended the
-    /// token, so that another token follows.
-    bool Next(double& value) noexcept;
-
-    /// The text that is left.
-    std::string_view Rest() const noexcept { return m_text.substr(Position()); }
+    /// Reads the next numbers, as many as there is room for, and returns how many; fewer when the
+    /// text is used up. Each is the value that ReadNumber finds for the token in front of the next
+    /// blank, or for all that is left; the white space behind that blank does not count. Behind
+    /// the last blank there is a token even if nothing follows. A text of nothing has no number.
+    std::size_t Next(std::span<double> values) noexcept;
 
 private:
-    /// Characters that are looked at together, and how many of them must be left for a number to be
-    /// read from them.
-    static constexpr std::size_t kPiece = 512;
-    static constexpr std::size_t kLongest = 64;
-    static constexpr std::size_t kBehind = 8;
+    double NextOfAnyKind();
 
-    std::size_t Position() const { return static_cast<std::size_t>(m_at - m_piece.data()); }
-    void Load(std::string_view text);
-    void Skip(std::size_t count);
-    void SkipWhite();
-    bool NextOfAnyKind(double& value);
-
-    /// A piece of `m_text`, from its start on, and zeros: digits are looked at eight at a time.
-    std::array<unsigned char, kPiece + kBehind> m_piece;
-    std::string_view m_text;
-    const unsigned char* m_at;
-    /// Where the piece ends, and behind which position a number may reach beyond that.
-    const unsigned char* m_end;
-    const unsigned char* m_last;
+    const char* m_at;
+    const char* m_end;
+    bool m_more;
 };
 
 /// The decimal integer at the start of `text`: white space, a sign, digits; what follows is

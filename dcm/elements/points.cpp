@@ -5,6 +5,7 @@
 #include "dcm/platform/text.h"
 
 #include <algorithm>
+#include <array>
 #include <utility>
 
 namespace dcm {
@@ -29,14 +30,17 @@ bool KeepsValue(VARTYPE type)
 void ReadNumbers(std::string_view rest, const PointArray& array)
 {
     NumberReader numbers(rest);
-    bool more = !rest.empty();
-    while (more) {
-        double number = 0;
-        more = numbers.Next(number);
-        if (array.type == VT_R8)
-            array.points.emplace_back(number);
-        else
-            AppendPoint(array, CComVariant(number));
+    std::array<double, kNumbersAtOnce> values;
+    std::size_t count = values.size();
+    while (count == values.size()) {
+        count = numbers.Next(values);
+        const std::span<const double> read(values.data(), count);
+        if (array.type == VT_R8) {
+            array.points.insert(array.points.end(), read.begin(), read.end());
+        } else {
+            for (const double number : read)
+                AppendPoint(array, CComVariant(number));
+        }
     }
 }
 
@@ -48,7 +52,7 @@ void ReadTexts(FileTextView line, const PointArray& array)
     while (!rest.empty()) {
         line.DropFirst();
         const std::size_t end = rest.find('"');
-        const FileTextView text = {rest.substr(0, end), line.encoding};
+        const FileTextView text = {rest.substr(0, end), line.file};
         rest = end == rest.npos ? std::string_view() : TrimWhite(rest.substr(end + 1));
         AppendPoint(array, CComVariant(text.Wide()));
     }
@@ -77,11 +81,11 @@ void AppendPoint(const PointArray& array, CComVariant&& point)
     array.type = type;
 }
 
-void ReservePoints(std::vector<CComVariant>& points, long long count, FileTextView block)
+void ReservePoints(std::vector<CComVariant>& points, long long count, const FileBlock& block)
 {
     // The shortest item is a digit and a blank. An array in use grows by itself: room made time
     // and again would copy it each time.
-    const auto most = static_cast<long long>(block.bytes.size() / 2);
+    const auto most = static_cast<long long>(block.Size() / 2);
     if (points.empty() && count > 0)
         points.reserve(static_cast<std::size_t>(std::min(count, most)));
 }
@@ -97,18 +101,28 @@ void ReadPoints(FileTextView rest, const PointArray* numbers, const PointArray* 
     }
 }
 
-bool ReadPointLine(std::string_view keyword, FileTextView rest,
-                   std::span<const PointTarget> targets)
+bool PointReader::Read(const BlockLine& line)
 {
-    for (const PointTarget& target : targets) {
-        const bool numbers = EqualsNoCase(keyword, target.keywords.numbers);
-        if (numbers || EqualsNoCase(keyword, target.keywords.texts)) {
-            const PointArray* const array = &target.array;
-            ReadPoints(rest, numbers ? array : nullptr, numbers ? nullptr : array);
-            return true;
-        }
+    if (line.keyword != m_last->keyword) {
+        std::swap(m_last, m_other);
+        if (line.keyword != m_last->keyword)
+            *m_last = Find(line.keyword);
     }
-    return false;
+    if (m_last->numbers == nullptr && m_last->texts == nullptr)
+        return false;
+    ReadPoints(line.rest, m_last->numbers, m_last->texts);
+    return true;
+}
+
+PointReader::Line PointReader::Find(std::string_view keyword) const
+{
+    for (const PointTarget& target : m_targets) {
+        if (EqualsNoCase(keyword, target.keywords.numbers))
+            return {keyword, &target.array, nullptr};
+        if (EqualsNoCase(keyword, target.keywords.texts))
+            return {keyword, nullptr, &target.array};
+    }
+    return {keyword};
 }
 
 void CopyPoints(const std::vector<CComVariant>& points, std::vector<CComVariant>& target)

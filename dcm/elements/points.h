@@ -1,5 +1,6 @@
 #pragma once
 
+#include "dcm/elements/block_lines.h"
 #include "dcm/elements/block_text.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/platform/automation.h"
@@ -29,7 +30,7 @@ void AppendPoint(const PointArray& array, const VARIANT& point);
 void AppendPoint(const PointArray& array, CComVariant&& point);
 
 /// Makes room for as many points as the block announces, but not for more than its text can hold.
-void ReservePoints(std::vector<CComVariant>& points, long long count, FileTextView block);
+void ReservePoints(std::vector<CComVariant>& points, long long count, const FileBlock& block);
 
 /// Reads the items of one point line: quoted texts when it begins and ends with a double quote,
 /// numbers otherwise. Items of a kind without an array are dropped.
@@ -58,10 +59,36 @@ struct PointTarget
     PointArray array;
 };
 
-/// Reads one point line into the target whose keyword it has; false when it has none of them.
-/// Numbers under the keyword of texts are dropped, and the reverse.
-bool ReadPointLine(std::string_view keyword, FileTextView rest,
-                   std::span<const PointTarget> targets);
+/// Reads the point lines of a block into the targets whose keywords they have.
+class PointReader
+{
+public:
+    /// The targets must outlive the reader.
+    explicit PointReader(std::span<const PointTarget> targets) : m_targets(targets) {}
+    PointReader(const PointReader&) = delete;
+    PointReader& operator=(const PointReader&) = delete;
+
+    /// Reads a point line; false when it has the keyword of no target. Numbers under the keyword of
+    /// texts are dropped, and the reverse.
+    bool Read(const BlockLine& line);
+
+private:
+    /// A keyword and the array that takes what its lines hold, if there is one.
+    struct Line
+    {
+        std::string_view keyword;
+        const PointArray* numbers = nullptr;
+        const PointArray* texts = nullptr;
+    };
+
+    Line Find(std::string_view keyword) const;
+
+    std::span<const PointTarget> m_targets;
+    /// Most lines have the keyword of the one in front of them, or of the last with another.
+    Line m_lines[2];
+    Line* m_last = m_lines;
+    Line* m_other = m_lines + 1;
+};
 
 /// Writes the points of an array five to a line; those that are neither number nor text take no
 /// place.

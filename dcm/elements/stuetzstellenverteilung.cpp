@@ -23,10 +23,10 @@ DCMStuetzstellenverteilung::~DCMStuetzstellenverteilung() = default;
 
 HRESULT DCMStuetzstellenverteilung::Init(const CString& strBlock)
 {
-    return ReadBlock(dcm::FileTextOfHost(strBlock).View());
+    return ReadBlock(dcm::HostBlock(strBlock).Block());
 }
 
-HRESULT DCMStuetzstellenverteilung::ReadBlock(dcm::FileTextView block)
+HRESULT DCMStuetzstellenverteilung::ReadBlock(const dcm::FileBlock& block)
 {
     dcm::BlockLines lines(block);
     dcm::BlockLine line;
@@ -36,7 +36,7 @@ HRESULT DCMStuetzstellenverteilung::ReadBlock(dcm::FileTextView block)
         else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
             continue;
         else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnit = dcm::TrimBlanksAndQuotes(line.rest).Wide();
+            m_strUnit = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
         else if (line.Is(dcm::keyword::kStX) || line.Is(dcm::keyword::kStTxX))
             AddValues(line.rest);
         else if (line.Is(dcm::keyword::kStTxY) || line.Is(dcm::keyword::kText))
@@ -46,7 +46,7 @@ HRESULT DCMStuetzstellenverteilung::ReadBlock(dcm::FileTextView block)
 }
 
 /// The name. The count behind it says how much room to make.
-void DCMStuetzstellenverteilung::ReadFirstLine(dcm::FileTextView rest, dcm::FileTextView block)
+void DCMStuetzstellenverteilung::ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block)
 {
     SetName(dcm::TakeName(rest).Wide());
     dcm::ReservePoints(m_vecValues, dcm::ReadInteger(rest.bytes), block);

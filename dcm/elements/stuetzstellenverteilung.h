@@ -6,6 +6,7 @@
 #include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
+#include "dcm/textfile/fileblock.h"
 
 #include <string_view>
 #include <vector>
@@ -58,10 +59,10 @@ public:
 
 private:
     friend class DCMConverter;
-    void ReadFirstLine(dcm::FileTextView rest, dcm::FileTextView block);
+    void ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block);
     HRESULT AddValues(dcm::FileTextView rest);
     /// Init for the text of a file.
-    HRESULT ReadBlock(dcm::FileTextView block);
+    HRESULT ReadBlock(const dcm::FileBlock& block);
     /// Composes the block in `block`, which is empty before.
     void ComposeBlock(CString& block) const;
     void ExportValues(CString& block) const;

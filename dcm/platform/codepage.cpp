@@ -6,6 +6,7 @@
 #include <array>
 #include <cstdint>
 #include <cstring>
+#include <functional>
 #include <optional>
 #include <type_traits>
 #include <utility>
@@ -332,9 +333,8 @@ wchar_t* WidenWide(std::string_view bytes, wchar_t* to)
 
 FileText Copy(const std::string& utf8)
 {
-    FileText text{std::make_unique_for_overwrite<char[]>(utf8.size()), utf8.size(),
-                  Encoding::kUtf8};
-    std::memcpy(text.bytes.get(), utf8.data(), utf8.size());
+    FileText text(utf8.size(), Encoding::kUtf8);
+    text.EndAt(std::ranges::copy(utf8, text.bytes.get()).out);
     return text;
 }
 
@@ -348,21 +348,22 @@ bool SetThreadCodePage(unsigned identifier)
     return true;
 }
 
-FileText FileTextFromThreadCodePage(std::unique_ptr<char[]> bytes, std::size_t size)
+FileText FileTextFromThreadCodePage(FileText text)
 {
     const unsigned codePage = ThreadCodePage();
-    if (const auto encoding = FindEncoding(codePage))
-        return {std::move(bytes), size, *encoding};
-    return Copy(system::CodePageToUtf8(codePage, {bytes.get(), size}));
+    const auto encoding = FindEncoding(codePage);
+    if (!encoding)
+        return Copy(system::CodePageToUtf8(codePage, text.Bytes()));
+    text.encoding = *encoding;
+    return text;
 }
 
 FileText FileTextFromWide(std::wstring_view text)
 {
     const Encoding encoding = FindEncoding(ThreadCodePage()).value_or(Encoding::kUtf8);
-    auto bytes = std::make_unique_for_overwrite<char[]>(text.size() * MostBytes(encoding));
-    const char* const end = NarrowTo(bytes.get(), text, encoding);
-    const auto size = static_cast<std::size_t>(end - bytes.get());
-    return {std::move(bytes), size, encoding};
+    FileText result(text.size() * MostBytes(encoding), encoding);
+    result.EndAt(NarrowTo(result.bytes.get(), text, encoding));
+    return result;
 }
 
 FileText ToThreadCodePage(FileText text)
@@ -375,8 +376,8 @@ FileText ToThreadCodePage(FileText text)
 
 FileText FileTextOfHost(std::wstring_view text)
 {
-    auto bytes = std::make_unique_for_overwrite<char[]>(text.size() * kBytesOfWide);
-    char* to = bytes.get();
+    FileText result(text.size() * kBytesOfWide, Encoding::kWide);
+    char* to = result.bytes.get();
     for (;;) {
         const std::size_t ascii = AsciiLength(text);
         to = CopyNumbers(text.data(), ascii, to);
@@ -388,32 +389,31 @@ FileText FileTextOfHost(std::wstring_view text)
         for (std::size_t i = 0; i < kBytesOfWide; ++i, c >>= 6)
             *to++ = static_cast<char>(0x80 | (c & 0x3F));
     }
-    const auto size = static_cast<std::size_t>(to - bytes.get());
-    return {std::move(bytes), size, Encoding::kWide};
+    result.EndAt(to);
+    return result;
 }
 
-void AppendWide(CString& text, FileTextView view)
+void AppendWide(CString& text, std::string_view bytes, Encoding encoding)
 {
-    const std::string_view bytes = view.bytes;
     if (bytes.empty())
         return;
     // No byte of any encoding gives more than one wide character.
     wchar_t* const to = text.Extend(bytes.size());
-    if (view.encoding == Encoding::kUtf8)
+    if (encoding == Encoding::kUtf8)
         return text.EndExtend(WidenUtf8(bytes, to));
-    if (view.encoding == Encoding::kWide)
+    if (encoding == Encoding::kWide)
         return text.EndExtend(WidenWide(bytes, to));
     // ISO-8859-1 is how Unicode begins.
     text.EndExtend(CopyNumbers(bytes.data(), bytes.size(), to));
-    if (view.encoding == Encoding::kWindows1252)
+    if (encoding == Encoding::kWindows1252)
         Replace1252(bytes, to);
 }
 
 void FileTextView::DropFirst()
 {
-    if (encoding == Encoding::kUtf8)
+    if (file->encoding == Encoding::kUtf8)
         TakeUtf8(bytes);
-    else if (encoding == Encoding::kWide && HasHigh(bytes.substr(0, 1)))
+    else if (file->encoding == Encoding::kWide && HasHigh(bytes.substr(0, 1)))
         bytes.remove_prefix(std::min(bytes.size(), kBytesOfWide));
     else
         bytes.remove_prefix(1);
@@ -422,8 +422,32 @@ void FileTextView::DropFirst()
 CString FileTextView::Wide() const
 {
     CString text;
-    AppendWide(text, *this);
+    AppendWide(text, bytes, file->encoding);
     return text;
+}
+
+CString FileTextView::SharedWide() const
+{
+    if (!file->wideTexts)
+        file->wideTexts = std::make_unique<WideTexts>();
+    return file->wideTexts->Get(*this);
+}
+
+CString WideTexts::Get(FileTextView text)
+{
+    constexpr std::size_t longest = 64;
+    if (text.bytes.size() > longest)
+        return text.Wide();
+    const std::size_t hash = std::hash<std::string_view>()(text.bytes);
+    Entry& entry = m_entries[hash % m_entries.size()];
+    if (entry.bytes != text.bytes) {
+        // Only a text that comes a second time is worth to be kept.
+        entry = {text.bytes, {}};
+        return text.Wide();
+    }
+    if (entry.wide.IsEmpty())
+        entry.wide = text.Wide();
+    return entry.wide;
 }
 
 CString Widen(std::string_view bytes)
@@ -431,9 +455,9 @@ CString Widen(std::string_view bytes)
     const unsigned codePage = ThreadCodePage();
     CString text;
     if (const auto encoding = FindEncoding(codePage))
-        AppendWide(text, {bytes, *encoding});
+        AppendWide(text, bytes, *encoding);
     else
-        AppendWide(text, {system::CodePageToUtf8(codePage, bytes), Encoding::kUtf8});
+        AppendWide(text, system::CodePageToUtf8(codePage, bytes), Encoding::kUtf8);
     return text;
 }
 
@@ -448,7 +472,7 @@ std::string ToUtf8(std::wstring_view text)
 CString FromUtf8(std::string_view text)
 {
     CString wide;
-    AppendWide(wide, {text, Encoding::kUtf8});
+    AppendWide(wide, text, Encoding::kUtf8);
     return wide;
 }
 

@@ -3,7 +3,9 @@
 #include "dcm/library/export.h"
 #include "dcm/platform/cstring.h"
 
+#include <array>
 #include <cstddef>
+#include <cstring>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -34,37 +36,80 @@ enum class Encoding : unsigned char
     kWide,
 };
 
-/// A piece of text in such an encoding, owned by somebody else.
+/// Bytes behind the text of a file that may be read, so that code which looks at eight bytes at a
+/// time need not look for the end first.
+inline constexpr std::size_t kReadAhead = 8;
+
+struct FileText;
+
+/// A piece of the text of a file.
 struct FileTextView
 {
     std::string_view bytes;
-    Encoding encoding;
+    /// Where it comes from; never null.
+    const FileText* file;
 
     /// Its wide form. Bytes that are no character in UTF-8 become U+FFFD.
     CString Wide() const;
+    /// The same for a text that the file is likely to repeat: equal texts share their memory.
+    CString SharedWide() const;
     /// Drops the first character; the text is not empty.
     void DropFirst();
+};
+
+/// Remembers the last texts that were widened.
+class WideTexts
+{
+public:
+    /// The wide form of a text whose file outlives this object.
+    CString Get(FileTextView text);
+
+private:
+    struct Entry
+    {
+        std::string_view bytes;
+        CString wide;
+    };
+
+    std::array<Entry, 256> m_entries;
 };
 
 /// The bytes of a text file, in an encoding that can be cut.
 struct FileText
 {
-    /// `size` bytes in `encoding`, owned.
+    /// `size` bytes in `encoding`, owned, and `kReadAhead` zeros behind them.
     std::unique_ptr<char[]> bytes;
     std::size_t size = 0;
     Encoding encoding = Encoding::kWindows1252;
 
+    /// No text, and no memory for one.
+    FileText() = default;
+    /// Memory for up to `room` bytes, for the owner to fill.
+    FileText(std::size_t room, Encoding textEncoding)
+        : bytes(std::make_unique_for_overwrite<char[]>(room + kReadAhead)), encoding(textEncoding)
+    {}
+    /// Ends the text where its owner stopped to fill the memory.
+    void EndAt(std::size_t length)
+    {
+        size = length;
+        std::memset(bytes.get() + length, 0, kReadAhead);
+    }
+    void EndAt(const char* end) { EndAt(static_cast<std::size_t>(end - bytes.get())); }
+
     /// The bytes, valid as long as they are owned here.
     std::string_view Bytes() const { return {bytes.get(), size}; }
-    FileTextView View() const { return {Bytes(), encoding}; }
+    FileTextView View() const { return {Bytes(), this}; }
+
+    /// Texts of a file repeat each other; made when it is first needed.
+    mutable std::unique_ptr<WideTexts> wideTexts;
 };
 
-/// Takes the bytes of a file in the thread's code page. They stay as they are where that page can
-/// be cut; text of any other page is converted to UTF-8 whole.
-FileText FileTextFromThreadCodePage(std::unique_ptr<char[]> bytes, std::size_t size);
+/// The text of a file whose bytes are in the thread's code page, whatever `text` says. They stay as
+/// they are where that page can be cut; text of any other page is converted to UTF-8 whole.
+FileText FileTextFromThreadCodePage(FileText text);
 
-/// Appends the wide form.
-void AppendWide(CString& text, FileTextView view);
+/// Appends the wide form of `bytes`.
+void AppendWide(CString& text, std::string_view bytes, Encoding encoding);
 
 /// The wide form of `bytes` in the thread's code page.
 CString Widen(std::string_view bytes);

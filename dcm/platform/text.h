@@ -1,6 +1,9 @@
 #pragma once
 
 #include <algorithm>
+#include <bit>
+#include <cstdint>
+#include <cstring>
 #include <string_view>
 
 /// What white space and letter case mean in this format. All that they concern is ASCII, so that
@@ -11,6 +14,41 @@ namespace dcm {
 constexpr bool IsWhite(char c)
 {
     return c == ' ' || (c >= '\t' && c <= '\r');
+}
+
+/// The eight characters at `at` in the bytes of a word, the first in the lowest.
+inline std::uint64_t EightCharacters(const char* at)
+{
+    std::uint64_t text = 0;
+    if constexpr (std::endian::native == std::endian::little) {
+        std::memcpy(&text, at, sizeof text);
+    } else {
+        for (int i = 0; i < 8; ++i)
+            text |= std::uint64_t{static_cast<unsigned char>(at[i])} << (8 * i);
+    }
+    return text;
+}
+
+/// Eight times the byte `value`.
+constexpr std::uint64_t EightTimes(unsigned char value)
+{
+    return value * std::uint64_t{0x0101'0101'0101'0101};
+}
+
+/// Where the white space at `at` is over, `end` at the latest. Eight characters behind `end` may be
+/// looked at.
+inline const char* SkipWhite(const char* at, const char* end)
+{
+    while (at < end) {
+        const std::uint64_t others = EightCharacters(at) ^ EightTimes(' ');
+        at += others == 0 ? 8 : std::countr_zero(others) / 8;
+        if (others != 0) {
+            if (!IsWhite(*at))
+                break;
+            ++at;
+        }
+    }
+    return std::min(at, end);
 }
 
 /// Lower case of A to Z; any other character stays as it is.

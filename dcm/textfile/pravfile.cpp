@@ -24,7 +24,7 @@ dcm::FileText WithCrLf(const dcm::FileText& text)
 {
     std::string_view rest = text.Bytes();
     // A text of nothing but line feeds becomes twice as long.
-    dcm::FileText result{std::make_unique_for_overwrite<char[]>(2 * rest.size()), 0, text.encoding};
+    dcm::FileText result(2 * rest.size(), text.encoding);
     char* to = result.bytes.get();
     for (;;) {
         const std::size_t end = rest.find('\n');
@@ -38,7 +38,7 @@ dcm::FileText WithCrLf(const dcm::FileText& text)
         *to++ = '\n';
         rest.remove_prefix(end + 1);
     }
-    result.size = static_cast<std::size_t>(to - result.bytes.get());
+    result.EndAt(to);
     return result;
 }
 
@@ -69,12 +69,14 @@ void PravFile::LoadContent(UINT flags)
         return;
     const ULONGLONG length = GetLength();
     CheckSize(length);
-    auto bytes = std::make_unique_for_overwrite<char[]>(length);
-    dcm::system::ExpectToFill(bytes.get(), length);
-    std::size_t size = Read(bytes.get(), static_cast<UINT>(length));
-    if (const void* const zero = std::memchr(bytes.get(), '\0', size))
-        size = static_cast<std::size_t>(static_cast<const char*>(zero) - bytes.get());
-    dcm::FileText content = dcm::FileTextFromThreadCodePage(std::move(bytes), size);
+    dcm::FileText content(length, dcm::Encoding::kWindows1252);
+    char* const bytes = content.bytes.get();
+    dcm::system::ExpectToFill(bytes, length);
+    const std::size_t size = Read(bytes, static_cast<UINT>(length));
+    content.EndAt(size);
+    // A zero ends the text.
+    content.EndAt(std::strlen(bytes));
+    content = dcm::FileTextFromThreadCodePage(std::move(content));
     CheckSize(content.size);
     m_content = std::move(content);
 }
@@ -104,25 +106,18 @@ int PravFile::ReadLine(CString& line)
     std::string_view bytes;
     if (!TakeLine(bytes))
         return 0;
-    dcm::AppendWide(line, {bytes, m_content.encoding});
+    dcm::AppendWide(line, bytes, m_content.encoding);
     return 1;
 }
 
-bool PravFile::ReadBlock(dcm::FileTextView& block)
+bool PravFile::ReadBlock()
 {
-    // The lines move together over the carriage returns between them.
-    char* const start = m_content.bytes.get() + m_nReadPos;
-    char* end = start;
-    block = {{start, end}, m_content.encoding};
+    m_block.Clear();
     std::string_view line;
     while (TakeLine(line)) {
-        if (line.empty()) {
-            block.bytes = {start, end};
+        if (line.empty())
             return true;
-        }
-        std::memmove(end, line.data(), line.size());
-        end += line.size();
-        *end++ = '\n';
+        m_block.AddLine(line.data(), line.data() + line.size());
     }
     return false;
 }

@@ -4,6 +4,7 @@
 #include "dcm/platform/cfile.h"
 #include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
+#include "dcm/textfile/fileblock.h"
 
 #include <cstdint>
 #include <string_view>
@@ -43,16 +44,17 @@ protected:
 private:
     friend class DCMConverter;
 
-    /// Hands out the lines up to the next empty one, each followed by one line feed; an empty
-    /// block where two empty lines meet. Returns false, and an empty block, when no further empty
-    /// line follows: what is left is dropped. The block stays valid until the file is opened anew.
-    bool ReadBlock(dcm::FileTextView& block);
+    /// Takes the lines up to the next empty one; none where two empty lines meet. Returns false when
+    /// no further empty line follows: what is left is dropped.
+    bool ReadBlock();
+    /// The lines taken last, valid until the next call or until the file is opened anew.
+    const dcm::FileBlock& Block() const { return m_block; }
 
     /// Cuts the next line off, without its line feed and the carriage returns before that.
     bool TakeLine(std::string_view& line);
 
-    /// Bytes, as wide text takes four times the memory: only what is kept of them is widened. Those
-    /// that have been handed out as a block are used up.
+    /// Bytes, as wide text takes four times the memory: only what is kept of them is widened.
     dcm::FileText m_content;
     std::int32_t m_nReadPos = 0;
+    dcm::FileBlock m_block{m_content};
 };

@@ -1,0 +1,14 @@
+#include "dcm/textfile/fileblock.h"
+
+namespace dcm {
+
+HostBlock::HostBlock(std::wstring_view text) : m_text(FileTextOfHost(text)), m_block(m_text)
+{
+    std::string_view rest = m_text.Bytes();
+    if (rest.starts_with('\n'))
+        return;
+    for (std::size_t end = 0; (end = rest.find('\n')) != rest.npos; rest.remove_prefix(end + 1))
+        m_block.AddLine(rest.data(), rest.data() + end);
+}
+
+} // namespace dcm
