@@ -34,7 +34,7 @@ void Counted(Work work)
 
 void WriteNumbers(const std::vector<double>& numbers)
 {
-    std::array<wchar_t, dcm::kNumberTextMax> text;
+    std::array<char, dcm::kNumberTextMax> text;
     Counted([&] {
         for (const double number : numbers)
             dcm::WriteNumber(number, 17, text.data());
@@ -45,7 +45,7 @@ void ReadTokens(const std::vector<double>& numbers)
 {
     std::string line;
     for (const double number : numbers) {
-        std::array<wchar_t, dcm::kNumberTextMax> text;
+        std::array<char, dcm::kNumberTextMax> text;
         line.append(line.empty() ? 0 : 2, L' ');
         line.append(text.data(), dcm::WriteNumber(number, 17, text.data()));
     }

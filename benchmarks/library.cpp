@@ -80,8 +80,8 @@ const TakesPart kExport("export/dcm", [](const Stage& stage) {
 });
 
 const TakesPart kNumberText("text/dcm", [](const Stage& stage) {
-    return TimedNumberTexts<wchar_t>(
-        stage, [](double number, wchar_t* to) { return WriteNumber(number, 17, to); });
+    return TimedNumberTexts<char>(
+        stage, [](double number, char* to) { return WriteNumber(number, 17, to); });
 });
 
 const TakesPart kNumberToken("token/dcm", [](const Stage& stage) {

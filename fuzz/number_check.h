@@ -86,11 +86,11 @@ private:
 /// What is written for a number, with the blank in front.
 inline std::string Text(double number, int digits)
 {
-    std::wstring text(dcm::kNumberTextMax + 1, L'x');
-    const wchar_t* const end = dcm::WriteNumber(number, digits, text.data());
-    if (text.back() != L'x')
+    std::string text(dcm::kNumberTextMax + 1, 'x');
+    const char* const end = dcm::WriteNumber(number, digits, text.data());
+    if (text.back() != 'x')
         return "more than its room";
-    return {static_cast<const wchar_t*>(text.data()), end};
+    return {static_cast<const char*>(text.data()), end};
 }
 
 /// What is wrong with how the numbers of a line are read, each alone and among the others; empty if

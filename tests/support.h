@@ -1,6 +1,7 @@
 #pragma once
 
 #include "dcm/library/dcm.h"
+#include "dcm/platform/file_text_builder.h"
 
 #include <charconv>
 #include <filesystem>
@@ -108,10 +109,12 @@ inline std::vector<std::vector<std::string>> Rows(const CString& path)
     return rows;
 }
 
-/// `text` in the thread's code page.
+/// `text` in the thread's code page, its lines ended by CR LF.
 inline std::string Narrow(std::wstring_view text)
 {
-    return std::string(dcm::ToThreadCodePage(dcm::FileTextFromWide(text)).Bytes());
+    auto builder = dcm::FileTextBuilder::ForFile();
+    std::string converted;
+    return std::string(dcm::ToThreadCodePage(builder.Append(text).Bytes(), converted));
 }
 
 /// What a block writes, with single line feeds. `block` is changed as its export changes it.

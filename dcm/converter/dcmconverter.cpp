@@ -1,6 +1,7 @@
 #include "dcm/converter/dcmconverter.h"
 
 #include "dcm/elements/keywords.h"
+#include "dcm/platform/file_text_builder.h"
 #include "dcm/platform/text.h"
 #include "dcm/textfile/pravfile.h"
 
@@ -276,9 +277,9 @@ HRESULT DCMConverter::WriteFormat(PravFile& file) const
 template <class Block>
 HRESULT DCMConverter::WriteBlocks(const std::list<Block>& blocks, PravFile& file)
 {
-    CString text;
+    auto text = dcm::FileTextBuilder::ForFile();
     for (const Block& block : blocks) {
-        text.Empty();
+        text.Clear();
         block.ComposeBlock(text);
         file.WriteText(text);
     }

@@ -10,26 +10,26 @@ DCMBaseType::~DCMBaseType() = default;
 
 CString DCMBaseType::ExportLangname(PravFile&) const
 {
-    CString line;
+    auto line = dcm::FileTextBuilder::ForHost();
     AppendLangname(line);
-    return line;
+    return line.Wide();
 }
 
 CString DCMBaseType::ExportDisplayname(PravFile&) const
 {
-    CString line;
+    auto line = dcm::FileTextBuilder::ForHost();
     AppendDisplayname(line);
-    return line;
+    return line.Wide();
 }
 
 CString DCMBaseType::ExportFunktion(PravFile&) const
 {
-    CString line;
+    auto line = dcm::FileTextBuilder::ForHost();
     AppendFunktion(line);
-    return line;
+    return line.Wide();
 }
 
-void DCMBaseType::AppendAttributes(CString& block) const
+void DCMBaseType::AppendAttributes(dcm::FileTextBuilder& block) const
 {
     AppendLangname(block);
     AppendDisplayname(block);
@@ -50,18 +50,18 @@ bool DCMBaseType::ReadAttribute(std::string_view keyword, dcm::FileTextView valu
     return true;
 }
 
-void DCMBaseType::AppendLangname(CString& block) const
+void DCMBaseType::AppendLangname(dcm::FileTextBuilder& block) const
 {
     dcm::AppendQuotedLine(block, dcm::keyword::kLangname, m_strLangname);
 }
 
-void DCMBaseType::AppendDisplayname(CString& block) const
+void DCMBaseType::AppendDisplayname(dcm::FileTextBuilder& block) const
 {
     if (!m_strDisplayname.IsEmpty())
         dcm::AppendQuotedLine(block, dcm::keyword::kDisplayname, m_strDisplayname);
 }
 
-void DCMBaseType::AppendFunktion(CString& block) const
+void DCMBaseType::AppendFunktion(dcm::FileTextBuilder& block) const
 {
     if (!m_strFunction.IsEmpty())
         dcm::AppendLine(block, dcm::keyword::kFunktion, m_strFunction);

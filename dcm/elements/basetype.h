@@ -50,7 +50,7 @@ protected:
     CString ExportFunktion(PravFile& file) const;
 
     /// Appends the three lines to a block.
-    void AppendAttributes(CString& block) const;
+    void AppendAttributes(dcm::FileTextBuilder& block) const;
 
     /// Stores `value` when `keyword` is that of LANGNAME or DISPLAYNAME, `function` when it is
     /// that of FUNKTION; otherwise returns false.
@@ -58,9 +58,9 @@ protected:
                        dcm::FileTextView function);
 
 private:
-    void AppendLangname(CString& block) const;
-    void AppendDisplayname(CString& block) const;
-    void AppendFunktion(CString& block) const;
+    void AppendLangname(dcm::FileTextBuilder& block) const;
+    void AppendDisplayname(dcm::FileTextBuilder& block) const;
+    void AppendFunktion(dcm::FileTextBuilder& block) const;
 
     CString m_strName;
     CString m_strLangname;

@@ -10,42 +10,44 @@ namespace dcm {
 namespace {
 
 /// Tools tell a block's first line and its marks from the rest by this indent.
-constexpr std::wstring_view kIndent = L"    ";
+constexpr std::string_view kIndent = "    ";
 
 /// What follows a number that shares its line with others.
-constexpr std::wstring_view kNumberTrailer = L"   ";
+constexpr std::string_view kNumberTrailer = "   ";
 
-constexpr std::wstring_view kBlank = L" ";
-constexpr std::wstring_view kLineEnd = L"\n";
-constexpr std::wstring_view kOpeningQuote = L" \"";
-constexpr std::wstring_view kClosingQuote = L"\"\n";
-
-wchar_t* Put(std::wstring_view text, wchar_t* to)
+char* Put(std::string_view text, char* to)
 {
     return std::copy(text.begin(), text.end(), to);
 }
 
+/// Puts a keyword, which is ASCII.
+char* Put(std::wstring_view keyword, char* to)
+{
+    return std::transform(keyword.begin(), keyword.end(), to,
+                          [](wchar_t c) { return static_cast<char>(c); });
+}
+
 } // namespace
 
-void BeginLine(CString& block, std::wstring_view keyword)
+void BeginLine(FileTextBuilder& block, std::wstring_view keyword)
 {
-    wchar_t* const to = block.Extend(kIndent.size() + keyword.size());
+    char* const to = block.Extend(kIndent.size() + keyword.size());
     block.EndExtend(Put(keyword, Put(kIndent, to)));
 }
 
-void AppendLine(CString& block, std::wstring_view keyword, std::wstring_view value)
+void AppendLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view value)
 {
     BeginLine(block, keyword);
-    block.Append(kBlank).Append(value).Append(kLineEnd);
+    block.Append(L" ").Append(value).EndLine();
 }
 
-void AppendQuotedLine(CString& block, std::wstring_view keyword, std::wstring_view value)
+void AppendQuotedLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view value)
 {
     BeginLine(block, keyword);
-    block.Append(kOpeningQuote).Append(value).Append(kClosingQuote);
+    block.Append(L" \"").Append(value).Append(L"\"").EndLine();
 }
 
-void AppendUnitLine(CString& block, std::wstring_view keyword, std::wstring_view unit)
+void AppendUnitLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view unit)
 {
     if (!unit.empty())
         AppendQuotedLine(block, keyword, unit == L" " ? std::wstring_view() : unit);
@@ -57,32 +59,35 @@ void DropBlankUnit(CString& unit)
         unit.Empty();
 }
 
-void AppendSharedAxisLine(CString& block, std::wstring_view keyword, std::wstring_view name)
+void AppendSharedAxisLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view name)
 {
     if (!name.empty())
-        block.Append(keyword).Append(L" ").Append(name).Append(L"\n");
+        block.Append(keyword).Append(L" ").Append(name).EndLine();
 }
 
-void AppendEnd(CString& block)
+void AppendEnd(FileTextBuilder& block)
 {
     block.Append(keyword::kEnd).Append(L"\n\n");
 }
 
-void AppendQuotedText(CString& block, std::wstring_view text, const TextItemStyle& style)
+void AppendQuotedText(FileTextBuilder& block, std::wstring_view text, const TextItemStyle& style)
 {
-    wchar_t* to = block.Extend(text.size() + style.trailer.size() + 3);
-    to = Put(L" \"", to);
-    to = std::transform(text.begin(), text.end(), to, [&](wchar_t c) {
-        return style.replaced.find(c) == style.replaced.npos ? c : L'.';
-    });
-    *to++ = L'"';
-    block.EndExtend(Put(style.trailer, to));
+    block.Append(L" \"");
+    for (;;) {
+        const std::size_t end = text.find_first_of(style.replaced);
+        block.Append(text.substr(0, end));
+        if (end == text.npos)
+            break;
+        block.Append(L".");
+        text.remove_prefix(end + 1);
+    }
+    block.Append(L"\"").Append(style.trailer);
 }
 
 void ItemLines::AddNumber(std::wstring_view keyword, double number, int digits)
 {
     BeginItem(keyword);
-    wchar_t* const to = m_block.Extend(kNumberTextMax + kNumberTrailer.size());
+    char* const to = m_block.Extend(kNumberTextMax + kNumberTrailer.size());
     m_block.EndExtend(Put(kNumberTrailer, WriteNumber(number, digits, to)));
     EndItem();
 }
@@ -98,7 +103,7 @@ void ItemLines::AddText(std::wstring_view keyword, std::wstring_view text,
 void ItemLines::EndLine()
 {
     if (m_items > 0)
-        m_block.Append(kLineEnd);
+        m_block.EndLine();
     m_items = 0;
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "dcm/platform/cstring.h"
+#include "dcm/platform/file_text_builder.h"
 
 #include <concepts>
 #include <string>
@@ -10,33 +11,34 @@
 namespace dcm {
 
 /// Appends the indent and the keyword.
-void BeginLine(CString& block, std::wstring_view keyword);
+void BeginLine(FileTextBuilder& block, std::wstring_view keyword);
 
 /// Appends an indented line: keyword, blank, value.
-void AppendLine(CString& block, std::wstring_view keyword, std::wstring_view value);
+void AppendLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view value);
 
 /// Appends an indented line: keyword, blank, value in double quotes. Nothing is escaped.
-void AppendQuotedLine(CString& block, std::wstring_view keyword, std::wstring_view value);
+void AppendQuotedLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view value);
 
 /// Appends the line of a unit: none for an empty unit; a unit of one blank stands for a line with
 /// an empty unit.
-void AppendUnitLine(CString& block, std::wstring_view keyword, std::wstring_view unit);
+void AppendUnitLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view unit);
 
 /// What export does to a unit of one blank once its line is written: it becomes empty.
 void DropBlankUnit(CString& unit);
 
 /// Appends the not indented line that names a shared distribution; none for an empty name.
-void AppendSharedAxisLine(CString& block, std::wstring_view keyword, std::wstring_view name);
+void AppendSharedAxisLine(FileTextBuilder& block, std::wstring_view keyword,
+                          std::wstring_view name);
 
 /// Appends " " and the decimal number.
 template <std::integral Count>
-void AppendCount(CString& block, Count count)
+void AppendCount(FileTextBuilder& block, Count count)
 {
     block.Append(L" ").Append(std::to_wstring(count));
 }
 
 /// Appends "END" and the empty line without which a reader drops the block.
-void AppendEnd(CString& block);
+void AppendEnd(FileTextBuilder& block);
 
 /// How a text is written among others on a line.
 struct TextItemStyle
@@ -48,13 +50,15 @@ struct TextItemStyle
 };
 
 /// Appends a blank and the text in double quotes. Nothing is escaped.
-void AppendQuotedText(CString& block, std::wstring_view text, const TextItemStyle& style);
+void AppendQuotedText(FileTextBuilder& block, std::wstring_view text, const TextItemStyle& style);
 
 /// Composes lines of values: as many items to a line as fit, under the keyword of the first.
 class ItemLines
 {
 public:
-    ItemLines(CString& block, int itemsPerLine) : m_block(block), m_itemsPerLine(itemsPerLine) {}
+    ItemLines(FileTextBuilder& block, int itemsPerLine)
+        : m_block(block), m_itemsPerLine(itemsPerLine)
+    {}
 
     void AddNumber(std::wstring_view keyword, double number, int digits);
     void AddText(std::wstring_view keyword, std::wstring_view text, const TextItemStyle& style);
@@ -65,7 +69,7 @@ private:
     void BeginItem(std::wstring_view keyword);
     void EndItem();
 
-    CString& m_block;
+    FileTextBuilder& m_block;
     int m_itemsPerLine;
     int m_items = 0;
 };

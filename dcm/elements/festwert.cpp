@@ -12,7 +12,7 @@
 namespace {
 
 /// A text on its own line has nothing behind its closing quote.
-constexpr dcm::TextItemStyle kSingleText = {L"\n\r", L"\n"};
+constexpr dcm::TextItemStyle kSingleText = {L"\n\r", L""};
 
 /// The number that a value stands for; 0.0 when it stands for none.
 double NumberOf(const VARIANT& value)
@@ -47,18 +47,17 @@ double NumberOf(const VARIANT& value)
     }
 }
 
-void AppendValueLine(CString& block, const VARIANT& value)
+void AppendValueLine(dcm::FileTextBuilder& block, const VARIANT& value)
 {
     if (value.vt == VT_BSTR) {
         dcm::BeginLine(block, dcm::keyword::kText);
         dcm::AppendQuotedText(block, CComVariant::TextOf(value), kSingleText);
-        return;
+    } else {
+        dcm::BeginLine(block, dcm::keyword::kWert);
+        char* const to = block.Extend(dcm::kNumberTextMax);
+        block.EndExtend(dcm::WriteNumber(NumberOf(value), dcm::kFullDigits, to));
     }
-    dcm::BeginLine(block, dcm::keyword::kWert);
-    wchar_t* const to = block.Extend(dcm::kNumberTextMax + 1);
-    wchar_t* const end = dcm::WriteNumber(NumberOf(value), dcm::kFullDigits, to);
-    *end = L'\n';
-    block.EndExtend(end + 1);
+    block.EndLine();
 }
 
 } // namespace
@@ -120,16 +119,16 @@ void DCMFestwert::SetText(dcm::FileTextView text)
 
 HRESULT DCMFestwert::Export(PravFile& file)
 {
-    CString block;
+    auto block = dcm::FileTextBuilder::ForFile();
     ComposeBlock(block);
     dcm::DropBlankUnit(m_strUnit);
     file.WriteText(block);
     return S_OK;
 }
 
-void DCMFestwert::ComposeBlock(CString& block) const
+void DCMFestwert::ComposeBlock(dcm::FileTextBuilder& block) const
 {
-    block.Append(m_strKeyword).Append(L" ").Append(GetName()).Append(L"\n");
+    block.Append(m_strKeyword).Append(L" ").Append(GetName()).EndLine();
     AppendAttributes(block);
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnit);
     AppendValueLine(block, m_value);

@@ -66,7 +66,7 @@ private:
     /// Init for the text of a file.
     HRESULT ReadBlock(const dcm::FileBlock& block);
     /// Composes the block in `block`, which is empty before.
-    void ComposeBlock(CString& block) const;
+    void ComposeBlock(dcm::FileTextBuilder& block) const;
 
     CString m_strUnit;
     CComVariant m_value;

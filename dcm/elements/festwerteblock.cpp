@@ -153,14 +153,14 @@ HRESULT DCMFestwerteblock::AddStringValues(dcm::FileTextView line)
 
 HRESULT DCMFestwerteblock::Export(PravFile& file)
 {
-    CString block;
+    auto block = dcm::FileTextBuilder::ForFile();
     ComposeBlock(block);
     dcm::DropBlankUnit(m_strUnit);
     file.WriteText(block);
     return S_OK;
 }
 
-void DCMFestwerteblock::ComposeBlock(CString& block) const
+void DCMFestwerteblock::ComposeBlock(dcm::FileTextBuilder& block) const
 {
     block.Append(dcm::keyword::kFestwerteblock).Append(L" ").Append(GetName());
     if (m_nYValueCount == 0) {
@@ -171,14 +171,14 @@ void DCMFestwerteblock::ComposeBlock(CString& block) const
         block.Append(L" @");
         dcm::AppendCount(block, m_nYValueCount);
     }
-    block.Append(L"\n");
+    block.EndLine();
     AppendAttributes(block);
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnit);
     ExportValues(block);
     dcm::AppendEnd(block);
 }
 
-void DCMFestwerteblock::ExportValues(CString& block) const
+void DCMFestwerteblock::ExportValues(dcm::FileTextBuilder& block) const
 {
     if (m_nXValueCount > 0 && m_nYValueCount > 0)
         ExportValues2D(block);
@@ -187,12 +187,12 @@ void DCMFestwerteblock::ExportValues(CString& block) const
 }
 
 /// A row a line, whatever the number of rows.
-void DCMFestwerteblock::ExportValues2D(CString& block) const
+void DCMFestwerteblock::ExportValues2D(dcm::FileTextBuilder& block) const
 {
     AppendItems(block, m_nXValueCount, dcm::kShortDigits);
 }
 
-void DCMFestwerteblock::AppendItems(CString& block, int itemsPerLine, int digits) const
+void DCMFestwerteblock::AppendItems(dcm::FileTextBuilder& block, int itemsPerLine, int digits) const
 {
     dcm::ItemLines lines(block, itemsPerLine);
     if (!m_vecDoubleValues.empty()) {

@@ -75,10 +75,10 @@ private:
     /// Init for the text of a file.
     HRESULT ReadBlock(const dcm::FileBlock& block);
     /// Composes the block in `block`, which is empty before.
-    void ComposeBlock(CString& block) const;
-    void ExportValues(CString& block) const;
-    void ExportValues2D(CString& block) const;
-    void AppendItems(CString& block, int itemsPerLine, int digits) const;
+    void ComposeBlock(dcm::FileTextBuilder& block) const;
+    void ExportValues(dcm::FileTextBuilder& block) const;
+    void ExportValues2D(dcm::FileTextBuilder& block) const;
+    void AppendItems(dcm::FileTextBuilder& block, int itemsPerLine, int digits) const;
 
     CString m_strUnit;
     /// Lists in the interface; an array here, since a list takes four times the memory.

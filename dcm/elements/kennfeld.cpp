@@ -86,7 +86,7 @@ std::array<dcm::PointTarget, 3> DCMKennfeld::PointTargets()
 
 HRESULT DCMKennfeld::Export(PravFile& file)
 {
-    CString block;
+    auto block = dcm::FileTextBuilder::ForFile();
     ComposeBlock(block);
     dcm::DropBlankUnit(m_strUnitX);
     dcm::DropBlankUnit(m_strUnitY);
@@ -95,7 +95,7 @@ HRESULT DCMKennfeld::Export(PravFile& file)
     return S_OK;
 }
 
-void DCMKennfeld::ComposeBlock(CString& block) const
+void DCMKennfeld::ComposeBlock(dcm::FileTextBuilder& block) const
 {
     block.Append(m_strKeyword).Append(L" ").Append(GetName());
     const auto appendCount = [&](std::int32_t axisLength, std::size_t points) {
@@ -106,18 +106,18 @@ void DCMKennfeld::ComposeBlock(CString& block) const
     };
     appendCount(m_nAxisLengthX, m_vecAxisX.size());
     appendCount(m_nAxisLengthY, m_vecAxisY.size());
-    block.Append(L"\n");
+    block.EndLine();
     AppendAttributes(block);
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitX, m_strUnitX);
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitY, m_strUnitY);
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnitW);
     dcm::AppendSharedAxisLine(block, dcm::keyword::kSstX, m_strSharedXAxisUniqueName);
     dcm::AppendSharedAxisLine(block, dcm::keyword::kSstY, m_strSharedYAxisUniqueName);
-    const int head = block.GetLength();
+    const std::size_t head = block.Size();
     AppendValues(block);
-    if (block.GetLength() == head) {
+    if (block.Size() == head) {
         // Without lines of points or values nothing at all is written.
-        block.Empty();
+        block.Clear();
         return;
     }
     dcm::AppendEnd(block);
@@ -125,12 +125,12 @@ void DCMKennfeld::ComposeBlock(CString& block) const
 
 CString DCMKennfeld::ExportValues(PravFile&) const
 {
-    CString lines;
+    auto lines = dcm::FileTextBuilder::ForHost();
     AppendValues(lines);
-    return lines;
+    return lines.Wide();
 }
 
-void DCMKennfeld::AppendValues(CString& block) const
+void DCMKennfeld::AppendValues(dcm::FileTextBuilder& block) const
 {
     const std::size_t width = m_vecAxisX.size();
     if (width * m_vecAxisY.size() > m_vecValues.size())

@@ -115,8 +115,8 @@ private:
     /// Init for the text of a file.
     HRESULT ReadBlock(const dcm::FileBlock& block);
     /// Composes the block in `block`, which is empty before.
-    void ComposeBlock(CString& block) const;
-    void AppendValues(CString& block) const;
+    void ComposeBlock(dcm::FileTextBuilder& block) const;
+    void AppendValues(dcm::FileTextBuilder& block) const;
 
     CString m_strUnitX;
     CString m_strUnitY;

@@ -66,7 +66,7 @@ void DCMKennlinie::ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& b
 
 HRESULT DCMKennlinie::Export(PravFile& file)
 {
-    CString block;
+    auto block = dcm::FileTextBuilder::ForFile();
     ComposeBlock(block);
     dcm::DropBlankUnit(m_strUnitX);
     dcm::DropBlankUnit(m_strUnitW);
@@ -74,14 +74,14 @@ HRESULT DCMKennlinie::Export(PravFile& file)
     return S_OK;
 }
 
-void DCMKennlinie::ComposeBlock(CString& block) const
+void DCMKennlinie::ComposeBlock(dcm::FileTextBuilder& block) const
 {
     block.Append(m_strKeyword).Append(L" ").Append(GetName());
     if (m_nAxisLengthX > 0)
         dcm::AppendCount(block, m_nAxisLengthX);
     else
         dcm::AppendCount(block, m_vecValues.size());
-    block.Append(L"\n");
+    block.EndLine();
     AppendAttributes(block);
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitX, m_strUnitX);
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnitW);
@@ -90,7 +90,7 @@ void DCMKennlinie::ComposeBlock(CString& block) const
     dcm::AppendEnd(block);
 }
 
-void DCMKennlinie::ExportValues(CString& block) const
+void DCMKennlinie::ExportValues(dcm::FileTextBuilder& block) const
 {
     dcm::PointLines(block, dcm::kAxisX).AddGroup(m_vecAxis);
     dcm::PointLines(block, dcm::kValues).AddGroup(m_vecValues);

@@ -94,8 +94,8 @@ private:
     /// Init for the text of a file.
     HRESULT ReadBlock(const dcm::FileBlock& block);
     /// Composes the block in `block`, which is empty before.
-    void ComposeBlock(CString& block) const;
-    void ExportValues(CString& block) const;
+    void ComposeBlock(dcm::FileTextBuilder& block) const;
+    void ExportValues(dcm::FileTextBuilder& block) const;
 
     CString m_strUnitX;
     CString m_strUnitW;

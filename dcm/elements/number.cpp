@@ -38,10 +38,10 @@ bool TakeSign(std::string_view& text)
     return negative;
 }
 
-constexpr std::wstring_view kInfinityName = L"1.#INF";
+constexpr std::string_view kInfinityName = "1.#INF";
 
 /// The name of the infinity or not-a-number with these bits, without its sign.
-std::wstring_view SpecialName(std::uint64_t bits)
+std::string_view SpecialName(std::uint64_t bits)
 {
     constexpr std::uint64_t quietBit = 0x0008'0000'0000'0000;
     constexpr std::uint64_t defaultNotANumber = kSignBit | kInfinityBits | quietBit;
@@ -49,29 +49,32 @@ std::wstring_view SpecialName(std::uint64_t bits)
         return kInfinityName;
     }
     if (bits == defaultNotANumber) {
-        return L"1.#IND";
+        return "1.#IND";
     }
-    return (bits & quietBit) != 0 ? L"1.#QNAN" : L"1.#SNAN";
+    return (bits & quietBit) != 0 ? "1.#QNAN" : "1.#SNAN";
 }
 
 /// Writes the sixteen characters in the bytes of `text`, the lowest byte first.
-void WriteSixteen(uint128 text, wchar_t* to)
+void WriteSixteen(uint128 text, char* to)
 {
-    const auto bytes = std::bit_cast<std::array<unsigned char, 16>>(text);
-    for (std::size_t i = 0; i < bytes.size(); ++i) {
-        to[i] = bytes[i];
+    if constexpr (std::endian::native == std::endian::little) {
+        std::memcpy(to, &text, sizeof text);
+    } else {
+        for (int i = 0; i < 16; ++i) {
+            to[i] = static_cast<char>(text >> (8 * i));
+        }
     }
 }
 
 /// Writes "e", a sign and at least three digits.
-wchar_t* WriteExponent(int exponent, wchar_t* to)
+char* WriteExponent(int exponent, char* to)
 {
-    to[0] = L'e';
-    to[1] = exponent < 0 ? L'-' : L'+';
+    to[0] = 'e';
+    to[1] = exponent < 0 ? '-' : '+';
     const int size = std::abs(exponent);
-    to[2] = static_cast<wchar_t>(L'0' + size / 100);
-    to[3] = static_cast<wchar_t>(L'0' + size / 10 % 10);
-    to[4] = static_cast<wchar_t>(L'0' + size % 10);
+    to[2] = static_cast<char>('0' + size / 100);
+    to[3] = static_cast<char>('0' + size / 10 % 10);
+    to[4] = static_cast<char>('0' + size % 10);
     return to + 5;
 }
 
@@ -227,9 +230,13 @@ inline const char* TakeFixed(const char* at, Decimal& decimal)
         return at;
     }
     const auto* const more = at;
+    const auto seven = decimal.digits;
     at = TakeDigits(at, decimal.digits);
-    decimal.exponent -= static_cast<int>(at - more);
-    return FitsInDecimal(start, at) ? at : nullptr;
+    const auto count = at - more;
+    decimal.exponent -= static_cast<int>(count);
+    const bool fits =
+        count <= 12 || (count <= 19 && seven < kTens[static_cast<std::size_t>(19 - count)]);
+    return fits ? at : nullptr;
 }
 
 /// Adds the exponent at `at`, "e" included, to `exponent` and returns its end; `at` itself when
@@ -275,21 +282,21 @@ inline const char* TakeDecimal(const char* at, double& value)
 
 } // namespace
 
-wchar_t* WriteNumber(double value, int digits, wchar_t* to) noexcept
+char* WriteNumber(double value, int digits, char* to) noexcept
 {
     const auto bits = std::bit_cast<std::uint64_t>(value);
-    *to++ = L' ';
-    *to = L'-';
+    *to++ = ' ';
+    *to = '-';
     to += bits >> 63;
     const auto magnitude = bits & ~kSignBit;
     if (magnitude - 1 >= kInfinityBits - 1) {
-        return std::ranges::copy(magnitude == 0 ? L"0.0"sv : SpecialName(bits), to).out;
+        return std::ranges::copy(magnitude == 0 ? "0.0"sv : SpecialName(bits), to).out;
     }
     const auto decimal = ToDecimal(std::bit_cast<double>(magnitude), digits);
     const int exponent = decimal.exponent + digits - 1;
     // The first of seventeen digits, and the other sixteen.
     const auto whole = digits == 17 ? decimal.digits : decimal.digits * 100;
-    const auto first = static_cast<wchar_t>(L'0' + whole / kTenTo16);
+    const auto first = static_cast<char>('0' + whole / kTenTo16);
     const auto upper = SplitEight(whole % kTenTo16 / kTenTo8);
     const auto lower = SplitEight(whole % kTenTo8);
     const auto others = (uint128{lower | EightTimes('0')} << 64) | (upper | EightTimes('0'));
@@ -300,21 +307,21 @@ wchar_t* WriteNumber(double value, int digits, wchar_t* to) noexcept
 
     if (exponent < kFixedMin || exponent >= digits) {
         to[0] = first;
-        to[1] = L'.';
+        to[1] = '.';
         WriteSixteen(others, to + 2);
         return WriteExponent(exponent, to + (count > 1 ? count + 1 : 1));
     }
     // Below 1, zeros and the point stand in front of the digits. From 1 on the point goes behind as
     // many of the others as the exponent says; those behind it move by a byte, the last one out.
-    constexpr wchar_t zeros[] = {L'0', L'.', L'0', L'0', L'0'};
+    constexpr char zeros[] = {'0', '.', '0', '0', '0'};
     std::memcpy(to, zeros, sizeof zeros);
     to += exponent < 0 ? 1 - exponent : 0;
     const auto point = uint128{exponent >= 0 && exponent < 16 ? 1U : 0U} << (8 * (exponent & 15));
     const auto front = others & (point - 1);
     to[0] = first;
     WriteSixteen(front | (others ^ front) << 8 | point * '.', to + 1);
-    to[17] = exponent < 16 ? static_cast<wchar_t>(others >> 120) : L'.';
-    to[18] = L'0';
+    to[17] = exponent < 16 ? static_cast<char>(others >> 120) : '.';
+    to[18] = '0';
     return to + std::max(count, exponent + 2) + (exponent < 0 ? 0 : 1);
 }
 
@@ -349,7 +356,7 @@ double ReadNumber(std::string_view token) noexcept
     token.copy(piece.data(), longest);
     double value = 0.0;
     return TakeDecimal(piece.data(), value) == piece.data() + token.size() ? value
-                                                                            : ReadToken(token);
+                                                                           : ReadToken(token);
 }
 
 std::size_t NumberReader::Next(std::span<double> values) noexcept

@@ -19,7 +19,7 @@ inline constexpr int kShortDigits = 15;
 /// below 1e-4 and from 10 to the power of `digits`; ".0" follows an integer. Infinities and
 /// not-a-numbers have names: "1.#INF", "1.#QNAN", "-1.#IND", "1.#SNAN". Returns the text's end; no
 /// terminator. Characters behind the end, up to kNumberTextMax, may be overwritten.
-wchar_t* WriteNumber(double value, int digits, wchar_t* to) noexcept;
+char* WriteNumber(double value, int digits, char* to) noexcept;
 
 /// The number at the start of `text`, behind white space: its longest prefix that is a decimal
 /// number, rounded to nearest, ties to even; too large a number is infinity. Without a number +0.0,

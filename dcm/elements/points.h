@@ -95,7 +95,7 @@ private:
 class PointLines
 {
 public:
-    PointLines(CString& block, const PointKeywords& keywords)
+    PointLines(FileTextBuilder& block, const PointKeywords& keywords)
         : m_lines(block, kItemsPerLine), m_keywords(keywords)
     {}
 

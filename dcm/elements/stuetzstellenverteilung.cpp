@@ -62,25 +62,25 @@ HRESULT DCMStuetzstellenverteilung::AddValues(dcm::FileTextView rest)
 
 HRESULT DCMStuetzstellenverteilung::Export(PravFile& file)
 {
-    CString block;
+    auto block = dcm::FileTextBuilder::ForFile();
     ComposeBlock(block);
     dcm::DropBlankUnit(m_strUnit);
     file.WriteText(block);
     return S_OK;
 }
 
-void DCMStuetzstellenverteilung::ComposeBlock(CString& block) const
+void DCMStuetzstellenverteilung::ComposeBlock(dcm::FileTextBuilder& block) const
 {
     block.Append(dcm::keyword::kStuetzstellenverteilung).Append(L" ").Append(GetName());
     dcm::AppendCount(block, m_vecValues.size());
-    block.Append(L"\n").Append(dcm::keyword::kSst).Append(L"\n");
+    block.EndLine().Append(dcm::keyword::kSst).EndLine();
     AppendAttributes(block);
     dcm::AppendUnitLine(block, dcm::keyword::kEinheitX, m_strUnit);
     ExportValues(block);
     dcm::AppendEnd(block);
 }
 
-void DCMStuetzstellenverteilung::ExportValues(CString& block) const
+void DCMStuetzstellenverteilung::ExportValues(dcm::FileTextBuilder& block) const
 {
     dcm::PointLines(block, dcm::kAxisX).AddGroup(m_vecValues);
 }

@@ -1,6 +1,7 @@
 #include "dcm/platform/codepage.h"
 
 #include "dcm/platform/code_page_system.h"
+#include "dcm/platform/file_text_builder.h"
 
 #include <algorithm>
 #include <array>
@@ -285,9 +286,22 @@ char ToSingleByte(std::uint32_t c, Encoding encoding)
     return '?';
 }
 
+/// The bytes of a character in the encoding kWide: six bits of its number in each, from low to
+/// high, and the highest bit.
+constexpr std::size_t kBytesOfWide = sizeof(wchar_t) == 2 ? 3 : 6;
+
+char* PutAsWide(std::uint32_t c, char* to)
+{
+    for (std::size_t i = 0; i < kBytesOfWide; ++i, c >>= 6)
+        *to++ = static_cast<char>(0x80 | (c & 0x3F));
+    return to;
+}
+
 /// The most bytes that a wide character takes. Two of 16 bits make a character of four bytes.
 std::size_t MostBytes(Encoding encoding)
 {
+    if (encoding == Encoding::kWide)
+        return kBytesOfWide;
     if (encoding != Encoding::kUtf8)
         return 1;
     return sizeof(wchar_t) == 2 ? 3 : 4;
@@ -302,6 +316,11 @@ char* NarrowTo(char* to, std::wstring_view text, Encoding encoding)
         text.remove_prefix(ascii);
         if (text.empty())
             return to;
+        if (encoding == Encoding::kWide) {
+            to = PutAsWide(Number(text[0]), to);
+            text.remove_prefix(1);
+            continue;
+        }
         const std::uint32_t c = TakeWide(text);
         if (encoding == Encoding::kUtf8)
             to = PutUtf8(c, to);
@@ -309,10 +328,6 @@ char* NarrowTo(char* to, std::wstring_view text, Encoding encoding)
             *to++ = ToSingleByte(c, encoding);
     }
 }
-
-/// The bytes of a character in the encoding kWide: six bits of its number in each, from low to
-/// high, and the highest bit.
-constexpr std::size_t kBytesOfWide = sizeof(wchar_t) == 2 ? 3 : 6;
 
 wchar_t* WidenWide(std::string_view bytes, wchar_t* to)
 {
@@ -358,39 +373,68 @@ FileText FileTextFromThreadCodePage(FileText text)
     return text;
 }
 
-FileText FileTextFromWide(std::wstring_view text)
-{
-    const Encoding encoding = FindEncoding(ThreadCodePage()).value_or(Encoding::kUtf8);
-    FileText result(text.size() * MostBytes(encoding), encoding);
-    result.EndAt(NarrowTo(result.bytes.get(), text, encoding));
-    return result;
-}
-
-FileText ToThreadCodePage(FileText text)
-{
-    const unsigned codePage = ThreadCodePage();
-    if (FindEncoding(codePage))
-        return text;
-    return Copy(system::Utf8ToCodePage(codePage, text.Bytes()));
-}
-
 FileText FileTextOfHost(std::wstring_view text)
 {
     FileText result(text.size() * kBytesOfWide, Encoding::kWide);
-    char* to = result.bytes.get();
-    for (;;) {
-        const std::size_t ascii = AsciiLength(text);
-        to = CopyNumbers(text.data(), ascii, to);
-        text.remove_prefix(ascii);
-        if (text.empty())
-            break;
-        std::uint32_t c = Number(text[0]);
-        text.remove_prefix(1);
-        for (std::size_t i = 0; i < kBytesOfWide; ++i, c >>= 6)
-            *to++ = static_cast<char>(0x80 | (c & 0x3F));
-    }
-    result.EndAt(to);
+    result.EndAt(NarrowTo(result.bytes.get(), text, Encoding::kWide));
     return result;
+}
+
+FileTextBuilder FileTextBuilder::ForFile()
+{
+    return {FindEncoding(ThreadCodePage()).value_or(Encoding::kUtf8), true};
+}
+
+FileTextBuilder& FileTextBuilder::Append(std::wstring_view text)
+{
+    // Line feeds are rare, and what is between them is ready as it is.
+    for (;;) {
+        const std::size_t lineFeed = m_crLf ? text.find(L'\n') : text.npos;
+        const std::wstring_view line = text.substr(0, lineFeed);
+        char* const to = Extend(line.size() * MostBytes(m_encoding));
+        EndExtend(NarrowTo(to, line, m_encoding));
+        if (lineFeed == text.npos)
+            return *this;
+        EndLine();
+        text.remove_prefix(lineFeed + 1);
+    }
+}
+
+FileTextBuilder& FileTextBuilder::EndLine()
+{
+    char* to = Extend(2);
+    if (m_crLf && !Bytes().ends_with('\r'))
+        *to++ = '\r';
+    *to++ = '\n';
+    EndExtend(to);
+    return *this;
+}
+
+CString FileTextBuilder::Wide() const
+{
+    CString text;
+    AppendWide(text, Bytes(), m_encoding);
+    return text;
+}
+
+void FileTextBuilder::MakeRoom(std::size_t room)
+{
+    // Twice as much, so that a text that grows piece by piece is copied a few times only.
+    constexpr std::size_t least = 4096;
+    const std::size_t capacity = std::max({least, 2 * m_capacity, m_size + room});
+    auto bytes = std::make_unique_for_overwrite<char[]>(capacity);
+    std::ranges::copy(Bytes(), bytes.get());
+    m_bytes = std::move(bytes);
+    m_capacity = capacity;
+}
+
+std::string_view ToThreadCodePage(std::string_view bytes, std::string& converted)
+{
+    const unsigned codePage = ThreadCodePage();
+    if (FindEncoding(codePage))
+        return bytes;
+    converted = system::Utf8ToCodePage(codePage, bytes);
+    return converted;
 }
 
 void AppendWide(CString& text, std::string_view bytes, Encoding encoding)
@@ -428,6 +472,8 @@ CString FileTextView::Wide() const
 
 CString FileTextView::SharedWide() const
 {
+    if (file->encoding == Encoding::kWide) // A host hands over one block.
+        return Wide();
     if (!file->wideTexts)
         file->wideTexts = std::make_unique<WideTexts>();
     return file->wideTexts->Get(*this);

@@ -117,13 +117,7 @@ CString Widen(std::string_view bytes);
 /// `text` to be read like that of a file: all its characters, in the encoding kWide.
 FileText FileTextOfHost(std::wstring_view text);
 
-/// `text` for a file: in the thread's code page where that can be cut, in UTF-8 otherwise. A
-/// character that the encoding lacks becomes `?`.
-FileText FileTextFromWide(std::wstring_view text);
-
-/// The bytes for the file: those of `text`, or what UTF-8 becomes in a code page that cannot be
-/// cut.
-FileText ToThreadCodePage(FileText text);
+class FileTextBuilder;
 
 /// @endcond
 

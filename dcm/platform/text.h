@@ -57,14 +57,21 @@ constexpr wchar_t FoldCase(wchar_t c)
     return c >= L'A' && c <= L'Z' ? static_cast<wchar_t>(c + (L'a' - L'A')) : c;
 }
 
-/// Whether text of a file is `wide`, a word of ASCII, in letters of any case.
-constexpr bool EqualsNoCase(std::string_view text, std::wstring_view wide)
+/// Whether text of a file is `word`, which is ASCII, in letters of any case.
+template <class Character>
+constexpr bool EqualsNoCase(std::string_view text, std::basic_string_view<Character> word)
 {
-    return text.size() == wide.size() &&
-           std::equal(text.begin(), text.end(), wide.begin(), [](char narrow, wchar_t c) {
+    return text.size() == word.size() &&
+           std::equal(text.begin(), text.end(), word.begin(), [](char narrow, Character c) {
                const auto x = static_cast<wchar_t>(static_cast<unsigned char>(narrow));
-               return x == c || FoldCase(x) == FoldCase(c);
+               const auto y = static_cast<wchar_t>(c);
+               return x == y || FoldCase(x) == FoldCase(y);
            });
+}
+
+constexpr bool EqualsNoCase(std::string_view text, std::wstring_view keyword)
+{
+    return EqualsNoCase<wchar_t>(text, keyword);
 }
 
 /// `text` without the characters at its start for which `isTrimmed` holds.

@@ -24,8 +24,8 @@ public:
     void AddLine(const char* begin, const char* end)
     {
         const char* const start = m_file->bytes.get();
-        m_lines.push_back({static_cast<std::uint32_t>(begin - start),
-                           static_cast<std::uint32_t>(end - start)});
+        m_lines.push_back(
+            {static_cast<std::uint32_t>(begin - start), static_cast<std::uint32_t>(end - start)});
     }
 
     std::size_t LineCount() const { return m_lines.size(); }
@@ -41,7 +41,7 @@ public:
     }
 
 private:
-    /// Positions in the text, which is below 2 GiB.
+    /// Positions in the text, which is below 4 GiB.
     struct Span
     {
         std::uint32_t begin;
@@ -57,6 +57,7 @@ private:
 class HostBlock
 {
 public:
+    /// Raises `E_OUTOFMEMORY` for a text of 4 GiB and more.
     explicit HostBlock(std::wstring_view text);
 
     const FileBlock& Block() const { return m_block; }

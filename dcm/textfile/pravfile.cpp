@@ -1,12 +1,13 @@
 #include "dcm/textfile/pravfile.h"
 
+#include "dcm/platform/file_text_builder.h"
 #include "dcm/platform/system_file.h"
 
 #include <algorithm>
 #include <cstddef>
 #include <cstring>
 #include <limits>
-#include <memory>
+#include <string>
 #include <utility>
 
 namespace {
@@ -17,29 +18,6 @@ void CheckSize(ULONGLONG size)
 {
     if (size > std::numeric_limits<std::int32_t>::max())
         throw CFileException(CFileException::fileTooLarge, 0, CString());
-}
-
-/// `text` with CR LF as its only line end. A carriage return that no line feed follows stays.
-dcm::FileText WithCrLf(const dcm::FileText& text)
-{
-    std::string_view rest = text.Bytes();
-    // A text of nothing but line feeds becomes twice as long.
-    dcm::FileText result(2 * rest.size(), text.encoding);
-    char* to = result.bytes.get();
-    for (;;) {
-        const std::size_t end = rest.find('\n');
-        std::string_view line = rest.substr(0, end);
-        if (end != rest.npos && line.ends_with('\r'))
-            line.remove_suffix(1);
-        to = std::copy(line.begin(), line.end(), to);
-        if (end == rest.npos)
-            break;
-        *to++ = '\r';
-        *to++ = '\n';
-        rest.remove_prefix(end + 1);
-    }
-    result.EndAt(to);
-    return result;
 }
 
 } // namespace
@@ -124,9 +102,16 @@ bool PravFile::ReadBlock()
 
 int PravFile::WriteText(const CString& text)
 {
-    const dcm::FileText bytes = dcm::ToThreadCodePage(WithCrLf(dcm::FileTextFromWide(text)));
-    CheckSize(bytes.size);
-    if (bytes.size > 0)
-        Write(bytes.bytes.get(), static_cast<UINT>(bytes.size));
+    dcm::FileTextBuilder builder = dcm::FileTextBuilder::ForFile();
+    WriteText(builder.Append(text));
     return 1;
+}
+
+void PravFile::WriteText(const dcm::FileTextBuilder& text)
+{
+    std::string converted;
+    const std::string_view bytes = dcm::ToThreadCodePage(text.Bytes(), converted);
+    CheckSize(bytes.size());
+    if (!bytes.empty())
+        Write(bytes.data(), static_cast<UINT>(bytes.size()));
 }

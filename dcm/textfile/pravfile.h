@@ -35,6 +35,8 @@ public:
     /// carriage return before it, as CR LF, and characters that the thread's code page lacks as
     /// `?`. Returns 1; throws `CFileException` when not all of it could be written.
     int WriteText(const CString& text);
+    /// The same for a text that was composed for a file by this thread.
+    void WriteText(const dcm::FileTextBuilder& text);
 
 protected:
     /// Loads the text of the open file, or none when `flags` has the write flag or no file is open.
@@ -44,8 +46,8 @@ protected:
 private:
     friend class DCMConverter;
 
-    /// Takes the lines up to the next empty one; none where two empty lines meet. Returns false when
-    /// no further empty line follows: what is left is dropped.
+    /// Takes the lines up to the next empty one; none where two empty lines meet. Returns false
+    /// when no further empty line follows: what is left is dropped.
     bool ReadBlock();
     /// The lines taken last, valid until the next call or until the file is opened anew.
     const dcm::FileBlock& Block() const { return m_block; }
