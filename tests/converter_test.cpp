@@ -52,6 +52,15 @@ TEST(Document, AddsWhatItImports)
     EXPECT_EQ(Content(document), "two\n|abb");
 }
 
+TEST(Document, FindsNothingInALineWithoutAnEnd)
+{
+    for (const char byte : {'\0', '\xFF', 'x', ' ', '\r'}) {
+        DCMConverter document;
+        EXPECT_EQ(ImportBytes(document, std::string(100'000'000, byte)), S_OK);
+        EXPECT_EQ(Content(document), "|");
+    }
+}
+
 TEST(Document, WritesHeaderFormatAndBlocks)
 {
     DCMConverter document;

@@ -138,6 +138,22 @@ TEST(FileFault, OfEachCallIsReported)
     }
 }
 
+TEST(FileFault, OfAnyWriteEndsTheExport)
+{
+    const std::string bytes = ReadBytes(CString(DCM_ALL_KINDS));
+    const Folder folder;
+    const CString path = folder / L"a.dcm";
+    DCMConverter document;
+    EXPECT_EQ(ImportBytes(document, bytes, path), S_OK);
+    int number = 1;
+    for (HRESULT result = kFailed; result != S_OK; ++number) {
+        const bool met = Under({"write", number, EIO}, [&] { result = document.Export(path); });
+        EXPECT_EQ(result, met ? kFailed : S_OK);
+        EXPECT_TRUE(bytes.starts_with(ReadBytes(path)));
+    }
+    EXPECT_GT(number, 10);
+}
+
 TEST(LinuxFile, RefusesPipesAndWhatItMayNotOpen)
 {
     const Folder folder;
