@@ -98,7 +98,7 @@ inline std::string Text(double number, int digits)
 template <class Expected>
 std::string WrongLine(const std::string& line, Expected expected)
 {
-    const std::string text = line + "5.5e5 .5"; // What is behind the line must not count.
+    const std::string text = line + "\"5.5e5.5"; // What is behind the line must not count.
     static_assert(dcm::kReadAhead == 8);
     dcm::NumberReader numbers({text.data(), line.size()});
     std::array<double, dcm::kNumbersAtOnce> values;

@@ -37,8 +37,9 @@ inline constexpr std::size_t kNumbersAtOnce = 16;
 class NumberReader
 {
 public:
-    /// The text must outlive the reader, and `kReadAhead` characters behind it must be there to be
-    /// read; what they are does not count.
+    /// The text must outlive the reader. `kReadAhead` characters behind it must be there to be
+    /// read, and the first must be none that a number could go on with: texts of a file are cut in
+    /// front of white space, a quote or a zero.
     explicit NumberReader(std::string_view text) noexcept
         : m_at(text.data()), m_end(m_at + text.size()), m_more(!text.empty())
     {}
