@@ -103,10 +103,17 @@ void ReadPoints(FileTextView rest, const PointArray* numbers, const PointArray* 
 
 bool PointReader::Read(const BlockLine& line)
 {
-    if (line.keyword != m_last->keyword) {
+    // No keyword of points is longer than a word.
+    const std::size_t size = line.keyword.size();
+    if (size == 0 || size > sizeof(std::uint64_t))
+        return false;
+    const Line found = {size, EightCharacters(line.keyword.data()) << (64 - 8 * size)};
+    if (!found.HasKeywordOf(*m_last)) {
         std::swap(m_last, m_other);
-        if (line.keyword != m_last->keyword)
-            *m_last = Find(line.keyword);
+        if (!found.HasKeywordOf(*m_last)) {
+            *m_last = found;
+            Find(line.keyword, *m_last);
+        }
     }
     if (m_last->numbers == nullptr && m_last->texts == nullptr)
         return false;
@@ -114,15 +121,15 @@ bool PointReader::Read(const BlockLine& line)
     return true;
 }
 
-PointReader::Line PointReader::Find(std::string_view keyword) const
+/// Finds the array that takes what lines with this keyword hold.
+void PointReader::Find(std::string_view keyword, Line& line) const
 {
     for (const PointTarget& target : m_targets) {
         if (EqualsNoCase(keyword, target.keywords.numbers))
-            return {keyword, &target.array, nullptr};
-        if (EqualsNoCase(keyword, target.keywords.texts))
-            return {keyword, nullptr, &target.array};
+            line.numbers = &target.array;
+        else if (EqualsNoCase(keyword, target.keywords.texts))
+            line.texts = &target.array;
     }
-    return {keyword};
 }
 
 void CopyPoints(const std::vector<CComVariant>& points, std::vector<CComVariant>& target)

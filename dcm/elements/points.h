@@ -8,6 +8,7 @@
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
 
+#include <cstdint>
 #include <span>
 #include <string_view>
 #include <vector>
@@ -73,15 +74,22 @@ public:
     bool Read(const BlockLine& line);
 
 private:
-    /// A keyword and the array that takes what its lines hold, if there is one.
+    /// A keyword, its characters in one word, and the array that takes what its lines hold, if
+    /// there is one.
     struct Line
     {
-        std::string_view keyword;
+        std::size_t size = 0;
+        std::uint64_t keyword = 0;
         const PointArray* numbers = nullptr;
         const PointArray* texts = nullptr;
+
+        bool HasKeywordOf(const Line& other) const
+        {
+            return size == other.size && keyword == other.keyword;
+        }
     };
 
-    Line Find(std::string_view keyword) const;
+    void Find(std::string_view keyword, Line& line) const;
 
     std::span<const PointTarget> m_targets;
     /// Most lines have the keyword of the one in front of them, or of the last with another.

@@ -20,6 +20,26 @@ void CheckSize(ULONGLONG size)
         throw CFileException(CFileException::fileTooLarge, 0, CString());
 }
 
+/// Reads `length` bytes, fewer where the file ends early, and returns how many of them are text: a
+/// zero ends it. That is looked for while the bytes are still near the processor.
+std::size_t ReadText(CFile& file, char* bytes, std::size_t length)
+{
+    constexpr std::size_t most = std::size_t{256} * 1024;
+    const void* zero = nullptr;
+    char* to = bytes;
+    for (char* const end = bytes + length; to != end;) {
+        const auto wanted = std::min(static_cast<std::size_t>(end - to), most);
+        const UINT count = file.Read(to, static_cast<UINT>(wanted));
+        if (zero == nullptr)
+            zero = std::memchr(to, '\0', count);
+        to += count;
+        if (count < wanted)
+            break;
+    }
+    return static_cast<std::size_t>((zero == nullptr ? to : static_cast<const char*>(zero)) -
+                                    bytes);
+}
+
 } // namespace
 
 PravFile::PravFile() noexcept = default;
@@ -50,10 +70,7 @@ void PravFile::LoadContent(UINT flags)
     dcm::FileText content(length, dcm::Encoding::kWindows1252);
     char* const bytes = content.bytes.get();
     dcm::system::ExpectToFill(bytes, length);
-    const std::size_t size = Read(bytes, static_cast<UINT>(length));
-    content.EndAt(size);
-    // A zero ends the text.
-    content.EndAt(std::strlen(bytes));
+    content.EndAt(ReadText(*this, bytes, static_cast<std::size_t>(length)));
     content = dcm::FileTextFromThreadCodePage(std::move(content));
     CheckSize(content.size);
     m_content = std::move(content);
