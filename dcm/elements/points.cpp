@@ -107,7 +107,8 @@ bool PointReader::Read(const BlockLine& line)
     const std::size_t size = line.keyword.size();
     if (size == 0 || size > sizeof(std::uint64_t))
         return false;
-    const Line found = {size, EightCharacters(line.keyword.data()) << (64 - 8 * size)};
+    const std::uint64_t all = ~std::uint64_t{0} >> (64 - 8 * size);
+    const Line found = {size, EightCharacters(line.keyword.data()) & all};
     if (!found.HasKeywordOf(*m_last)) {
         std::swap(m_last, m_other);
         if (!found.HasKeywordOf(*m_last)) {
