@@ -114,8 +114,8 @@ TEST(CodePages, KeepEachByte)
     for (const unsigned page : {28591U, 1252U}) {
         dcm::SetThreadCodePage(page);
         for (int number = 0; number < 256; ++number) {
-            const std::string byte(1, static_cast<char>(number));
-            EXPECT_EQ(Replaced(Narrow(dcm::Widen(byte)), "\r\n", "\n"), byte);
+            const std::string text(1, static_cast<char>(number));
+            EXPECT_EQ(Replaced(Narrow(dcm::Widen(text)), "\r\n", "\n"), text);
         }
         EXPECT_EQ(dcm::Widen("\x81\x8D\x8F\x90\x9D"), L"\u0081\u008D\u008F\u0090\u009D");
     }
