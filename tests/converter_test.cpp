@@ -54,9 +54,9 @@ TEST(Document, AddsWhatItImports)
 
 TEST(Document, FindsNothingInALineWithoutAnEnd)
 {
-    for (const char byte : {'\0', '\xFF', 'x', ' ', '\r'}) {
+    for (const char fill : {'\0', '\xFF', 'x', ' ', '\r'}) {
         DCMConverter document;
-        EXPECT_EQ(ImportBytes(document, std::string(100'000'000, byte)), S_OK);
+        EXPECT_EQ(ImportBytes(document, std::string(100'000'000, fill)), S_OK);
         EXPECT_EQ(Content(document), "|");
     }
 }
