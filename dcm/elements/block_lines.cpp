@@ -1,7 +1,6 @@
 #include "dcm/elements/block_lines.h"
 
 #include <algorithm>
-#include <bit>
 #include <cstdint>
 
 namespace dcm {
@@ -17,7 +16,7 @@ const char* SkipWord(const char* at, const char* end)
         const std::uint64_t text = EightCharacters(at);
         const std::uint64_t low = (text - EightTimes(0x21)) & ~text & EightTimes(0x80);
         if (low != 0)
-            return std::min(at + std::countr_zero(low) / 8, end);
+            return std::min(at + FirstByte(low), end);
     }
     return end;
 }

@@ -120,12 +120,12 @@ inline bool ToDouble(Decimal decimal, double& value) noexcept
         value = 0.0;
         return true;
     }
-    if (decimal.exponent < kMinPower || decimal.exponent > kMaxPower) {
+    const auto index = static_cast<unsigned>(decimal.exponent - kMinPower);
+    if (index >= kPowers.size()) {
         return false;
     }
     const int zeros = std::countl_zero(decimal.digits);
-    const auto product =
-        uint128{decimal.digits << zeros} * kPowers[PowerIndex(decimal.exponent)].high;
+    const auto product = uint128{decimal.digits << zeros} * kPowers[index].high;
     const auto h = static_cast<std::uint64_t>(product >> 64);
     // H becomes a significand of 53 bits and 10 more. Where it loses a bit by that, the exact
     // product still lies in [H, H + 2).
@@ -150,12 +150,31 @@ inline std::uint64_t DigitBytes(const char* at)
     return EightCharacters(at) ^ EightTimes('0');
 }
 
-/// Bits in the upper half of each byte that is not a digit, none in those that are: only 10 to 15
-/// need the added 6 to reach the upper half. Behind a byte from 0xFA on, into which the sum
-/// carries, digits may have them too.
+/// What NotDigits marks a byte with.
+constexpr std::uint64_t kNotDigit = 0x80;
+
+/// The highest bit of each byte that is not a digit, nothing of those that are: only 10 and more
+/// reach it with the added 118. Behind a byte from 0x8A on, out of which the sum carries, digits
+/// may be marked too.
 constexpr std::uint64_t NotDigits(std::uint64_t bytes)
 {
-    return (bytes | (bytes + EightTimes(6))) & EightTimes(0xF0);
+    return (bytes | (bytes + EightTimes(kNotDigit - 10))) & EightTimes(kNotDigit);
+}
+
+/// The highest bit of each byte that is not a point, and any other bits. A slash behind a point is
+/// taken for another one.
+constexpr std::uint64_t NotPoints(std::uint64_t bytes)
+{
+    // The sum is the byte's negative, with the highest bit for 1 to 128. It carries out of a point
+    // only, which makes a negative of 0 for the slash: that is 1 here.
+    const auto others = bytes ^ EightTimes('.' ^ '0');
+    return others | (~others + EightTimes(1));
+}
+
+/// Whether bytes that are digits or points are all digits.
+constexpr bool AreDigits(std::uint64_t bytes)
+{
+    return (bytes & EightTimes(('.' ^ '0') & 0xF0)) == 0;
 }
 
 /// The number whose digits are the bytes 0 to 9 of a word, the first in the lowest byte.

@@ -175,7 +175,7 @@ inline const char* TakeDigits(const char* at, std::uint64_t& number)
         const auto others = NotDigits(bytes);
         if (others != 0) {
             // No branch on the count, which changes from number to number.
-            const auto size = static_cast<unsigned>(std::countr_zero(others)) / 8;
+            const auto size = FirstByte(others);
             number = number * kTens[size] + JoinEight(bytes << 8 << (56 - 8 * size));
             return at + size;
         }
@@ -184,11 +184,13 @@ inline const char* TakeDigits(const char* at, std::uint64_t& number)
     }
 }
 
-/// Whether what was taken from `at` to `end` is at most 19 digits, zeros in front not counted.
+/// Whether what was taken from `at` to `end` is at most 19 digits, zeros in front not counted as
+/// long as the exponent stays small with them.
 inline bool FitsInDecimal(const char* at, const char* end)
 {
     constexpr std::ptrdiff_t most = 19;
-    if (end - at > most) {
+    constexpr std::ptrdiff_t mostWithZeros = 1000;
+    if (end - at > most && end - at <= mostWithZeros) {
         while (*at == '0' || *at == '.') {
             ++at;
         }
@@ -196,14 +198,20 @@ inline bool FitsInDecimal(const char* at, const char* end)
     return end - at <= most;
 }
 
-/// Takes the digits at `at` and a point among them; returns their end, or a null pointer when there
-/// is no digit or there are too many.
-inline const char* TakeFixed(const char* at, Decimal& decimal)
+/// The bytes of a word with those up to the first of `others` moved up by one, over it: if that is
+/// the point, all digits are in a row then.
+inline std::uint64_t WithoutPoint(std::uint64_t bytes, std::uint64_t others)
 {
-    const auto* const start = at;
-    const auto bytes = DigitBytes(at);
-    const auto others = NotDigits(bytes);
+    const auto upToFirst = others ^ (others - 1);
+    return (bytes & ~upToFirst) | (bytes & upToFirst >> 8) << 8;
+}
+
+/// TakeFixed for a number that goes on behind its first eight characters.
+inline const char* TakeLong(const char* at, std::uint64_t bytes, std::uint64_t others,
+                            Decimal& decimal)
+{
     if (others == 0) {
+        const auto* const start = at;
         at = TakeDigits(at, decimal.digits);
         if (*at == '.') {
             const auto* const fraction = at + 1;
@@ -212,31 +220,41 @@ inline const char* TakeFixed(const char* at, Decimal& decimal)
         }
         return FitsInDecimal(start, at) ? at : nullptr;
     }
-    // The digits in front of the first other character, those behind it if that is the point, and
-    // where they end or, after seven, the word does. All positions are in bits.
-    const int first = std::countr_zero(others) & 56;
-    const int point = ((bytes >> first) & 0xFF) == ('.' ^ '0') ? 8 : 0;
-    const auto front = (std::uint64_t{1} << first) - 1;
-    const auto digits = (bytes & front) | ((bytes >> point) & ~front);
-    const auto behind = ((others >> point) & ~front) | kSignBit;
-    const int size = std::countr_zero(behind) & 56;
-    if (size == 0) {
-        return nullptr;
-    }
-    decimal.digits = JoinEight(digits << (64 - size));
-    decimal.exponent = (first - size) >> 3;
-    at += (size + point) >> 3;
-    if (size < 56) {
-        return at;
-    }
-    const auto* const more = at;
-    const auto seven = decimal.digits;
-    at = TakeDigits(at, decimal.digits);
-    const auto count = at - more;
-    decimal.exponent -= static_cast<int>(count);
+    const auto digits = WithoutPoint(bytes, others);
+    const auto seven = JoinEight(digits);
+    decimal.digits = seven;
+    const auto* const end = TakeDigits(at + 8, decimal.digits);
+    const auto count = end - at - 8;
     const bool fits =
         count <= 12 || (count <= 19 && seven < kTens[static_cast<std::size_t>(19 - count)]);
-    return fits ? at : nullptr;
+    if (!fits || !AreDigits(digits)) {
+        return nullptr;
+    }
+    decimal.exponent = static_cast<int>(FirstByte(others)) - 7 - static_cast<int>(count);
+    return end;
+}
+
+/// Takes the digits at `at` and a point among them; returns their end, or a null pointer when there
+/// is no digit, more than one point or too many characters.
+inline const char* TakeFixed(const char* at, Decimal& decimal)
+{
+    const auto bytes = DigitBytes(at);
+    const auto others = NotDigits(bytes);
+    const auto ends = others & NotPoints(bytes);
+    if (ends == 0) {
+        return TakeLong(at, bytes, others, decimal);
+    }
+    // No branch on where the point is and how long the number: that changes from one to the next.
+    const auto size = FirstByte(ends);
+    const auto whole = FirstByte(others) + 1;
+    const auto last = std::max(size, whole);
+    const auto digits = WithoutPoint(bytes, others) << ((64 - 8 * last) % 64);
+    if (last == 1 || !AreDigits(digits)) {
+        return nullptr;
+    }
+    decimal.digits = JoinEight(digits);
+    decimal.exponent = static_cast<int>(whole - last);
+    return at + size;
 }
 
 /// Adds the exponent at `at`, "e" included, to `exponent` and returns its end; `at` itself when
@@ -259,8 +277,8 @@ const char* TakeExponent(const char* at, int& exponent)
     return last;
 }
 
-/// Reads the decimal number at `at` in the forms that files are full of, and returns its end; a
-/// null pointer for all that ReadToken must see.
+/// Reads the decimal number at `at` in the forms that files are full of, and returns its end. A
+/// null pointer, or an end inside the token, is for all that ReadToken must see.
 inline const char* TakeDecimal(const char* at, double& value)
 {
     const std::uint64_t negative = *at == '-' ? 1 : 0;
@@ -352,6 +370,9 @@ double ReadDecimal(std::string_view text) noexcept
 double ReadNumber(std::string_view token) noexcept
 {
     constexpr std::size_t longest = 64;
+    if (token.size() > longest) {
+        return ReadToken(token);
+    }
     std::array<char, longest + kReadAhead> piece{};
     token.copy(piece.data(), longest);
     double value = 0.0;
@@ -361,28 +382,30 @@ double ReadNumber(std::string_view token) noexcept
 
 std::size_t NumberReader::Next(std::span<double> values) noexcept
 {
+    const char* at = m_at;
+    const char* const end = m_end;
     auto to = values.begin();
-    while (m_more && to != values.end()) {
+    while (at != nullptr && to != values.end()) {
         double& value = *to++;
-        const char* const end = TakeDecimal(m_at, value);
-        if (end == m_end) {
-            m_more = false;
-        } else if (end != nullptr && *end == ' ' && end < m_end) {
-            m_at = SkipWhite(end + 1, m_end);
-        } else {
-            value = NextOfAnyKind();
-        }
+        const char* const last = TakeDecimal(at, value);
+        if (last != nullptr && *last == ' ' && last < end)
+            at = SkipWhite(last + 1, end);
+        else if (last == end)
+            at = nullptr;
+        else
+            value = NextOfAnyKind(at);
     }
+    m_at = at;
     return static_cast<std::size_t>(to - values.begin());
 }
 
-/// The next number from a token of any kind and length.
-double NumberReader::NextOfAnyKind()
+/// The next number from a token of any kind and length; `at` becomes the start of the one behind
+/// it, or null.
+double NumberReader::NextOfAnyKind(const char*& at) const
 {
-    const std::string_view rest(m_at, m_end);
+    const std::string_view rest(at, m_end);
     const auto blank = rest.find(' ');
-    m_more = blank != rest.npos;
-    m_at = m_more ? SkipWhite(m_at + blank, m_end) : m_end;
+    at = blank != rest.npos ? SkipWhite(at + blank, m_end) : nullptr;
     return ReadToken(rest.substr(0, blank));
 }
 

@@ -41,7 +41,7 @@ public:
     /// read, and the first must be none that a number could go on with: texts of a file are cut in
     /// front of white space, a quote or a zero.
     explicit NumberReader(std::string_view text) noexcept
-        : m_at(text.data()), m_end(m_at + text.size()), m_more(!text.empty())
+        : m_at(text.empty() ? nullptr : text.data()), m_end(text.data() + text.size())
     {}
 
     /// Reads the next numbers, as many as there is room for, and returns how many; fewer when the
@@ -51,11 +51,11 @@ public:
     std::size_t Next(std::span<double> values) noexcept;
 
 private:
-    double NextOfAnyKind();
+    double NextOfAnyKind(const char*& at) const;
 
+    /// The next token, or null when there is none.
     const char* m_at;
     const char* m_end;
-    bool m_more;
 };
 
 /// The decimal integer at the start of `text`: white space, a sign, digits; what follows is

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <bit>
+#include <cstddef>
 #include <cstdint>
 #include <cstring>
 #include <string_view>
@@ -13,7 +14,7 @@ namespace dcm {
 /// White space is U+0009 to U+000D and U+0020, whatever the locale.
 constexpr bool IsWhite(char c)
 {
-    return c == ' ' || (c >= '\t' && c <= '\r');
+    return c <= ' ' && (c == ' ' || (c >= '\t' && c <= '\r'));
 }
 
 /// The eight characters at `at` in the bytes of a word, the first in the lowest.
@@ -35,18 +36,26 @@ constexpr std::uint64_t EightTimes(unsigned char value)
     return value * std::uint64_t{0x0101'0101'0101'0101};
 }
 
+/// The place of the lowest byte of `word`, which is not zero, with a bit that is set.
+inline std::size_t FirstByte(std::uint64_t word)
+{
+    return static_cast<std::size_t>(std::countr_zero(word)) / 8;
+}
+
 /// Where the white space at `at` is over, `end` at the latest. Eight characters behind `end` may be
 /// looked at.
 inline const char* SkipWhite(const char* at, const char* end)
 {
     while (at < end) {
         const std::uint64_t others = EightCharacters(at) ^ EightTimes(' ');
-        at += others == 0 ? 8 : std::countr_zero(others) / 8;
-        if (others != 0) {
-            if (!IsWhite(*at))
-                break;
-            ++at;
+        if (others == 0) {
+            at += 8;
+            continue;
         }
+        at += FirstByte(others);
+        if (!IsWhite(*at))
+            break;
+        ++at;
     }
     return std::min(at, end);
 }
