@@ -43,7 +43,7 @@ struct BlockLine
 class BlockLines
 {
 public:
-    /// The block must outlive this object.
+    /// The block, whose lines are of a file's text, must outlive this object.
     explicit BlockLines(const FileBlock& block) : m_block(block) {}
 
     /// Takes the next such line. False at the end.

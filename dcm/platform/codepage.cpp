@@ -2,12 +2,12 @@
 
 #include "dcm/platform/code_page_system.h"
 #include "dcm/platform/file_text_builder.h"
+#include "dcm/platform/text.h"
 
 #include <algorithm>
 #include <array>
 #include <cstdint>
 #include <cstring>
-#include <functional>
 #include <optional>
 #include <type_traits>
 #include <utility>
@@ -346,6 +346,22 @@ wchar_t* WidenWide(std::string_view bytes, wchar_t* to)
     return to;
 }
 
+/// A place for a text, which is not empty, by its length and its first and last eight characters.
+std::uint8_t PlaceOf(std::string_view bytes)
+{
+    const std::size_t size = std::min(bytes.size(), std::size_t{8});
+    const std::uint64_t first = EightCharacters(bytes.data()) << (64 - 8 * size);
+    const std::uint64_t last = EightCharacters(bytes.data() + bytes.size() - size)
+                               << (64 - 8 * size);
+    constexpr std::uint64_t factor = 0x9E37'79B9'7F4A'7C15;
+    return static_cast<std::uint8_t>(((first + bytes.size()) * factor ^ last) * factor >> 56);
+}
+
+std::string_view BeforeZero(std::string_view bytes)
+{
+    return bytes.substr(0, bytes.find('\0'));
+}
+
 FileText Copy(const std::string& utf8)
 {
     FileText text(utf8.size(), Encoding::kUtf8);
@@ -368,7 +384,7 @@ FileText FileTextFromThreadCodePage(FileText text)
     const unsigned codePage = ThreadCodePage();
     const auto encoding = FindEncoding(codePage);
     if (!encoding)
-        return Copy(system::CodePageToUtf8(codePage, text.Bytes()));
+        return Copy(system::CodePageToUtf8(codePage, BeforeZero(text.Bytes())));
     text.encoding = *encoding;
     return text;
 }
@@ -482,10 +498,9 @@ CString FileTextView::SharedWide() const
 CString WideTexts::Get(FileTextView text)
 {
     constexpr std::size_t longest = 64;
-    if (text.bytes.size() > longest)
+    if (text.bytes.empty() || text.bytes.size() > longest)
         return text.Wide();
-    const std::size_t hash = std::hash<std::string_view>()(text.bytes);
-    Entry& entry = m_entries[hash % m_entries.size()];
+    Entry& entry = m_entries[PlaceOf(text.bytes)];
     if (entry.bytes != text.bytes) {
         // Only a text that comes a second time is worth to be kept.
         entry = {text.bytes, {}};

@@ -24,8 +24,8 @@ DCM_API bool SetThreadCodePage(unsigned identifier);
 /// @cond
 
 /// Encodings in which a text can be cut at any character of ASCII before it is widened: its bytes
-/// stand for themselves and are part of no other character. No other character may be taken for one
-/// byte.
+/// stand for themselves and are part of no other character. Only characters of ASCII are sure to be
+/// one byte.
 enum class Encoding : unsigned char
 {
     kWindows1252,
@@ -51,7 +51,8 @@ struct FileTextView
 
     /// Its wide form. Bytes that are no character in UTF-8 become U+FFFD.
     CString Wide() const;
-    /// The same for a text that the file is likely to repeat: equal texts share their memory.
+    /// The same for a text that the file is likely to repeat: equal texts share their memory. The
+    /// bytes must be the file's own.
     CString SharedWide() const;
     /// Drops the first character; the text is not empty.
     void DropFirst();
@@ -74,7 +75,8 @@ private:
     std::array<Entry, 256> m_entries;
 };
 
-/// The bytes of a text file, in an encoding that can be cut.
+/// The bytes of a text file, in an encoding that can be cut. A zero among them ends what lines are
+/// cut from.
 struct FileText
 {
     /// `size` bytes in `encoding`, owned, and `kReadAhead` zeros behind them.
@@ -105,7 +107,8 @@ struct FileText
 };
 
 /// The text of a file whose bytes are in the thread's code page, whatever `text` says. They stay as
-/// they are where that page can be cut; text of any other page is converted to UTF-8 whole.
+/// they are where that page can be cut; text of any other page, up to a zero, is converted to
+/// UTF-8.
 FileText FileTextFromThreadCodePage(FileText text);
 
 /// Appends the wide form of `bytes`.

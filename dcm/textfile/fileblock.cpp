@@ -14,7 +14,7 @@ HostBlock::HostBlock(std::wstring_view text) : m_text(FileTextOfHost(text)), m_b
     if (rest.starts_with('\n'))
         return;
     for (std::size_t end = 0; (end = rest.find('\n')) != rest.npos; rest.remove_prefix(end + 1))
-        m_block.AddLine(rest.data(), rest.data() + end);
+        m_block.AddLine(rest.substr(0, end));
 }
 
 } // namespace dcm

@@ -20,12 +20,11 @@ public:
 
     /// Removes the lines and keeps their memory.
     void Clear() { m_lines.clear(); }
-    /// Adds the line from `begin` to `end`, which is a part of the text.
-    void AddLine(const char* begin, const char* end)
+    /// Adds a line, which is a part of the text.
+    void AddLine(std::string_view line)
     {
-        const char* const start = m_file->bytes.get();
-        m_lines.push_back(
-            {static_cast<std::uint32_t>(begin - start), static_cast<std::uint32_t>(end - start)});
+        const auto begin = static_cast<std::uint32_t>(line.data() - m_file->bytes.get());
+        m_lines.push_back({begin, begin + static_cast<std::uint32_t>(line.size())});
     }
 
     std::size_t LineCount() const { return m_lines.size(); }
@@ -59,6 +58,8 @@ class HostBlock
 public:
     /// Raises `E_OUTOFMEMORY` for a text of 4 GiB and more.
     explicit HostBlock(std::wstring_view text);
+    HostBlock(const HostBlock&) = delete;
+    HostBlock& operator=(const HostBlock&) = delete;
 
     const FileBlock& Block() const { return m_block; }
 

@@ -20,24 +20,18 @@ void CheckSize(ULONGLONG size)
         throw CFileException(CFileException::fileTooLarge, 0, CString());
 }
 
-/// Reads `length` bytes, fewer where the file ends early, and returns how many of them are text: a
-/// zero ends it. That is looked for while the bytes are still near the processor.
-std::size_t ReadText(CFile& file, char* bytes, std::size_t length)
+/// Cuts the next line off, without its line feed and the carriage returns before that. A zero, the
+/// one behind the text if there is no other, ends what can be found.
+bool TakeLine(std::string_view& rest, std::string_view& line)
 {
-    constexpr std::size_t most = std::size_t{256} * 1024;
-    const void* zero = nullptr;
-    char* to = bytes;
-    for (char* const end = bytes + length; to != end;) {
-        const auto wanted = std::min(static_cast<std::size_t>(end - to), most);
-        const UINT count = file.Read(to, static_cast<UINT>(wanted));
-        if (zero == nullptr)
-            zero = std::memchr(to, '\0', count);
-        to += count;
-        if (count < wanted)
-            break;
-    }
-    return static_cast<std::size_t>((zero == nullptr ? to : static_cast<const char*>(zero)) -
-                                    bytes);
+    const char* const lineFeed = rest.empty() ? nullptr : std::strchr(rest.data(), '\n');
+    if (lineFeed == nullptr)
+        return false;
+    line = {rest.data(), lineFeed};
+    while (line.ends_with('\r'))
+        line.remove_suffix(1);
+    rest.remove_prefix(static_cast<std::size_t>(lineFeed + 1 - rest.data()));
+    return true;
 }
 
 } // namespace
@@ -53,6 +47,7 @@ PravFile::~PravFile() = default;
 
 BOOL PravFile::Open(const wchar_t* path, UINT flags, CFileException* error)
 {
+    DropContent();
     const BOOL opened = CFile::Open(path, flags, error);
     LoadContent(flags);
     return opened;
@@ -60,8 +55,7 @@ BOOL PravFile::Open(const wchar_t* path, UINT flags, CFileException* error)
 
 void PravFile::LoadContent(UINT flags)
 {
-    m_content = {};
-    m_nReadPos = 0;
+    DropContent();
     CFileStatus status;
     if (!GetStatus(status) || (flags & modeWrite) != 0)
         return;
@@ -70,37 +64,20 @@ void PravFile::LoadContent(UINT flags)
     dcm::FileText content(length, dcm::Encoding::kWindows1252);
     char* const bytes = content.bytes.get();
     dcm::system::ExpectToFill(bytes, length);
-    content.EndAt(ReadText(*this, bytes, static_cast<std::size_t>(length)));
+    content.EndAt(Read(bytes, static_cast<UINT>(length)));
     content = dcm::FileTextFromThreadCodePage(std::move(content));
     CheckSize(content.size);
     m_content = std::move(content);
 }
 
-bool PravFile::TakeLine(std::string_view& line)
-{
-    const char* const content = m_content.bytes.get();
-    const char* const start = content + m_nReadPos;
-    const char* const end = content + m_content.size;
-    if (start == end)
-        return false;
-    const auto* const lineFeed =
-        static_cast<const char*>(std::memchr(start, '\n', static_cast<std::size_t>(end - start)));
-    if (lineFeed == nullptr)
-        return false;
-    m_nReadPos = static_cast<std::int32_t>(lineFeed + 1 - content);
-    const char* last = lineFeed;
-    while (last != start && last[-1] == '\r')
-        --last;
-    line = {start, last};
-    return true;
-}
-
 int PravFile::ReadLine(CString& line)
 {
     line.Empty();
+    std::string_view rest = Rest();
     std::string_view bytes;
-    if (!TakeLine(bytes))
+    if (!TakeLine(rest, bytes))
         return 0;
+    KeepRest(rest);
     dcm::AppendWide(line, bytes, m_content.encoding);
     return 1;
 }
@@ -108,13 +85,13 @@ int PravFile::ReadLine(CString& line)
 bool PravFile::ReadBlock()
 {
     m_block.Clear();
+    std::string_view rest = Rest();
     std::string_view line;
-    while (TakeLine(line)) {
-        if (line.empty())
-            return true;
-        m_block.AddLine(line.data(), line.data() + line.size());
-    }
-    return false;
+    bool more = false;
+    while ((more = TakeLine(rest, line)) && !line.empty())
+        m_block.AddLine(line);
+    KeepRest(rest);
+    return more;
 }
 
 int PravFile::WriteText(const CString& text)

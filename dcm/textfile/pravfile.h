@@ -52,8 +52,20 @@ private:
     /// The lines taken last, valid until the next call or until the file is opened anew.
     const dcm::FileBlock& Block() const { return m_block; }
 
-    /// Cuts the next line off, without its line feed and the carriage returns before that.
-    bool TakeLine(std::string_view& line);
+    void DropContent() noexcept
+    {
+        m_content = {};
+        m_nReadPos = 0;
+    }
+    /// The content that has not been handed out.
+    std::string_view Rest() const
+    {
+        return m_content.Bytes().substr(static_cast<std::size_t>(m_nReadPos));
+    }
+    void KeepRest(std::string_view rest)
+    {
+        m_nReadPos = static_cast<std::int32_t>(m_content.size - rest.size());
+    }
 
     /// Bytes, as wide text takes four times the memory: only what is kept of them is widened.
     dcm::FileText m_content;
