@@ -17,12 +17,15 @@ namespace {
 constinit std::atomic<long> live = 0;
 /// Which of the thread's allocations from now on fails; 0 or less for none.
 constinit thread_local long untilFailure = 0;
+/// How much memory the thread has asked for.
+constinit thread_local std::size_t wanted = 0;
 
 } // namespace
 
 // Inlined, they would look to the compiler as if memory were freed in another way than it was got.
 [[gnu::noinline]] void* operator new(std::size_t size, const std::nothrow_t&) noexcept
 {
+    wanted += size;
     void* const memory = --untilFailure == 0 ? nullptr : std::malloc(size == 0 ? 1 : size);
     live += memory != nullptr ? 1 : 0;
     return memory;
@@ -172,4 +175,18 @@ TEST(Allocation, FailureIsRaisedByTheOtherCalls)
     };
     for (const auto& [name, operation] : cases)
         FailEach(name, true, operation);
+}
+
+TEST(Allocation, IsNotForPointsThatABlockCannotHold)
+{
+    const auto wantedFor = [](const std::string& counts) {
+        const std::string text = " a " + counts + "\n LANGNAME " + std::string(999, 'a') + "\n";
+        const std::size_t before = wanted;
+        DCMKennfeld().Init(dcm::FromUtf8("KENNFELD" + text));
+        DCMKennlinie().Init(dcm::FromUtf8("KENNLINIE" + text));
+        DCMStuetzstellenverteilung().Init(dcm::FromUtf8("STUETZSTELLENVERTEILUNG" + text));
+        return wanted - before;
+    };
+    EXPECT_EQ(wantedFor("99999999"), wantedFor("00000000"));
+    EXPECT_EQ(wantedFor("999 999"), wantedFor("000 000"));
 }

@@ -63,9 +63,9 @@ void DCMKennfeld::ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& bl
     SetName(dcm::TakeName(rest).Wide());
     m_nAxisLengthX = dcm::ReadInteger(dcm::TakeName(rest).bytes);
     m_nAxisLengthY = dcm::ReadInteger(rest.bytes);
-    dcm::ReservePoints(m_vecAxisX, m_nAxisLengthX, block);
-    dcm::ReservePoints(m_vecAxisY, m_nAxisLengthY, block);
-    dcm::ReservePoints(m_vecValues, std::int64_t{m_nAxisLengthX} * m_nAxisLengthY, block);
+    const std::int64_t values = std::int64_t{m_nAxisLengthX} * m_nAxisLengthY;
+    dcm::ReservePoints(
+        {{m_vecAxisX, m_nAxisLengthX}, {m_vecAxisY, m_nAxisLengthY}, {m_vecValues, values}}, block);
 }
 
 HRESULT DCMKennfeld::AddValues(std::wstring_view rest, std::wstring_view keyword)

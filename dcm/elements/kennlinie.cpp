@@ -60,8 +60,7 @@ void DCMKennlinie::ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& b
 {
     SetName(dcm::TakeName(rest).Wide());
     m_nAxisLengthX = dcm::ReadInteger(rest.bytes);
-    dcm::ReservePoints(m_vecAxis, m_nAxisLengthX, block);
-    dcm::ReservePoints(m_vecValues, m_nAxisLengthX, block);
+    dcm::ReservePoints({{m_vecAxis, m_nAxisLengthX}, {m_vecValues, m_nAxisLengthX}}, block);
 }
 
 HRESULT DCMKennlinie::Export(PravFile& file)

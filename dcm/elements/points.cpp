@@ -81,13 +81,17 @@ void AppendPoint(const PointArray& array, CComVariant&& point)
     array.type = type;
 }
 
-void ReservePoints(std::vector<CComVariant>& points, long long count, const FileBlock& block)
+void ReservePoints(std::initializer_list<AnnouncedPoints> arrays, const FileBlock& block)
 {
-    // The shortest item is a digit and a blank. An array in use grows by itself: room made time
-    // and again would copy it each time.
-    const auto most = static_cast<long long>(block.Size() / 2);
-    if (points.empty() && count > 0)
-        points.reserve(static_cast<std::size_t>(std::min(count, most)));
+    // The shortest item is a digit and a blank.
+    auto left = static_cast<std::int64_t>(block.Size() / 2);
+    for (const AnnouncedPoints& array : arrays)
+        left -= std::clamp(array.count, std::int64_t{0}, left + 1);
+    for (const AnnouncedPoints& array : arrays) {
+        // An array in use grows by itself: room made time and again would copy it each time.
+        if (left >= 0 && array.count > 0 && array.points.empty())
+            array.points.reserve(static_cast<std::size_t>(array.count));
+    }
 }
 
 void ReadPoints(FileTextView rest, const PointArray* numbers, const PointArray* texts)

@@ -9,6 +9,7 @@
 #include "dcm/platform/variant.h"
 
 #include <cstdint>
+#include <initializer_list>
 #include <span>
 #include <string_view>
 #include <vector>
@@ -30,11 +31,19 @@ void AppendPoint(const PointArray& array, const VARIANT& point);
 /// The same with a point whose text becomes the array's own.
 void AppendPoint(const PointArray& array, CComVariant&& point);
 
-/// Makes room for as many points as the block announces, but not for more than its text can hold.
-void ReservePoints(std::vector<CComVariant>& points, long long count, const FileBlock& block);
+/// An array of points and how many of them a block announces.
+struct AnnouncedPoints
+{
+    std::vector<CComVariant>& points;
+    std::int64_t count;
+};
 
-/// Reads the items of one point line: quoted texts when it begins and ends with a double quote,
-/// numbers otherwise. Items of a kind without an array are dropped.
+/// Makes room for the points that a block announces, unless they are more in all than its text can
+/// hold.
+void ReservePoints(std::initializer_list<AnnouncedPoints> arrays, const FileBlock& block);
+
+/// Reads the items of one point line of a file's text: quoted texts when it begins and ends with a
+/// double quote, numbers otherwise. Items of a kind without an array are dropped.
 void ReadPoints(FileTextView rest, const PointArray* numbers, const PointArray* texts);
 
 /// Replaces `target` by copies of the points, each text its own; leaves it as it was when memory
@@ -69,8 +78,8 @@ public:
     PointReader(const PointReader&) = delete;
     PointReader& operator=(const PointReader&) = delete;
 
-    /// Reads a point line; false when it has the keyword of no target. Numbers under the keyword of
-    /// texts are dropped, and the reverse.
+    /// Reads a point line of a file's text; false when it has the keyword of no target. Numbers
+    /// under the keyword of texts are dropped, and the reverse.
     bool Read(const BlockLine& line);
 
 private:

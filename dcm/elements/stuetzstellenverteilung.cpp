@@ -49,7 +49,7 @@ HRESULT DCMStuetzstellenverteilung::ReadBlock(const dcm::FileBlock& block)
 void DCMStuetzstellenverteilung::ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block)
 {
     SetName(dcm::TakeName(rest).Wide());
-    dcm::ReservePoints(m_vecValues, dcm::ReadInteger(rest.bytes), block);
+    dcm::ReservePoints({{m_vecValues, dcm::ReadInteger(rest.bytes)}}, block);
 }
 
 /// Numbers and texts are told apart by the quotes alone.
