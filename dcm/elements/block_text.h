@@ -7,7 +7,7 @@
 #include <string>
 #include <string_view>
 
-/// Composing the text of one block, line by line; each line ends in one line feed.
+/// Composing the text of one block, line by line; the builder knows how lines end.
 namespace dcm {
 
 /// Appends the indent and the keyword.

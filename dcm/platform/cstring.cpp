@@ -134,8 +134,10 @@ void CString::MakeRoom(std::size_t room)
     const std::size_t grown =
         length + room > capacity ? std::min(capacity + capacity / 2, kMaxLength) : capacity;
     dcm::CStringData* const data = NewData(std::max(length + room, grown));
-    std::wmemcpy(data->Text(), m_data->Text(), length + 1);
-    data->length = m_data->length;
+    if (length > 0) {
+        std::wmemcpy(data->Text(), m_data->Text(), length + 1);
+        data->length = m_data->length;
+    }
     Release();
     m_data = data;
 }

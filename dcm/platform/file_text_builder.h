@@ -17,19 +17,20 @@ public:
     /// A text for a file: in the thread's code page where that can be cut, in UTF-8 otherwise. A
     /// character that the encoding lacks becomes `?`, and each line ends in CR LF.
     static FileTextBuilder ForFile();
-    /// A text for the host: it keeps all characters, and each line ends in a line feed.
+    /// A text for the host: it keeps all characters, and the ends of its lines are line feeds.
     static FileTextBuilder ForHost() { return {Encoding::kWide, false}; }
 
     /// Makes the text empty and keeps its memory.
     void Clear() { m_size = 0; }
     std::size_t Size() const { return m_size; }
 
-    /// Adds a text. A line feed in it ends a line, and so does one with a carriage return in front.
+    /// Adds a text. In a text for a file, a line feed in it ends a line, with or without a carriage
+    /// return in front; the host's stays as it is.
     FileTextBuilder& Append(std::wstring_view text);
     /// Ends a line.
     FileTextBuilder& EndLine();
-    /// Makes room for `room` bytes of ASCII behind the text and returns where they go; the text is
-    /// only longer once `EndExtend` has been told where they end.
+    /// Makes room for `room` bytes, in the text's encoding, behind the text and returns where they
+    /// go; the text is only longer once `EndExtend` has been told where they end.
     char* Extend(std::size_t room)
     {
         if (room > m_capacity - m_size)
