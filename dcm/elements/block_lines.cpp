@@ -1,13 +1,12 @@
 #include "dcm/elements/block_lines.h"
 
-#include <algorithm>
 #include <cstdint>
 
 namespace dcm {
 
 namespace {
 
-/// The next character up to a blank, or `end`: there a word ends.
+/// The next character up to a blank: there a word ends. At `end` or behind it when there is none.
 const char* SkipWord(const char* at, const char* end)
 {
     for (; at < end; at += 8) {
@@ -16,9 +15,9 @@ const char* SkipWord(const char* at, const char* end)
         const std::uint64_t text = EightCharacters(at);
         const std::uint64_t low = (text - EightTimes(0x21)) & ~text & EightTimes(0x80);
         if (low != 0)
-            return std::min(at + FirstByte(low), end);
+            return at + FirstByte(low);
     }
-    return end;
+    return at;
 }
 
 } // namespace
@@ -30,9 +29,9 @@ bool BlockLines::Next(BlockLine& line)
         const char* const end = bytes.data() + bytes.size();
         const char* const start = SkipWhite(bytes.data(), end);
         const char* blank = SkipWord(start, end);
-        while (blank != end && *blank != ' ')
+        while (blank < end && *blank != ' ')
             blank = SkipWord(blank + 1, end);
-        if (blank != end) {
+        if (blank < end) {
             line = {{start, blank}, {{blank + 1, end}, file}};
             return true;
         }
