@@ -10,7 +10,8 @@
 
 namespace dcm {
 
-/// A text for a file that is composed piece by piece, as the bytes that it has there.
+/// A text for a file that is composed piece by piece, as the bytes that it has there. Its larger
+/// members stand in codepage.cpp, beside the encodings.
 class FileTextBuilder
 {
 public:
