@@ -1,8 +1,8 @@
 // Numbers are written as the standard library does it and read as the C library does it in the C
 // locale, but for the forms that the format has for itself.
 
-#include "fuzz/number_check.h"
 #include "fuzz/target.h"
+#include "tests/number_check.h"
 
 #include <algorithm>
 #include <cstring>

@@ -1,4 +1,4 @@
-#include "fuzz/number_check.h"
+#include "tests/number_check.h"
 #include "tests/support.h"
 
 #include <gtest/gtest.h>
