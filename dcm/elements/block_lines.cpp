@@ -12,10 +12,10 @@ const char* SkipWord(const char* at, const char* end)
     for (; at < end; at += 8) {
         // Only bytes below 0x21 borrow from their highest bit; where one does, those behind it may
         // be taken for such bytes too.
-        const std::uint64_t text = EightCharacters(at);
-        const std::uint64_t low = (text - EightTimes(0x21)) & ~text & EightTimes(0x80);
+        const std::uint64_t text = LoadWord(at);
+        const std::uint64_t low = (text - RepeatByte(0x21)) & ~text & RepeatByte(0x80);
         if (low != 0)
-            return at + FirstByte(low);
+            return at + LowestByteSet(low);
     }
     return at;
 }

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "dcm/platform/text.h"
+#include "dcm/platform/word.h"
 
 #include <array>
 #include <bit>
@@ -144,10 +144,10 @@ inline bool ToDouble(Decimal decimal, double& value) noexcept
     return true;
 }
 
-/// EightCharacters, with 0 to 9 for digits.
+/// LoadWord, with 0 to 9 for digits.
 inline std::uint64_t DigitBytes(const char* at)
 {
-    return EightCharacters(at) ^ EightTimes('0');
+    return LoadWord(at) ^ RepeatByte('0');
 }
 
 /// What NotDigits marks a byte with.
@@ -158,7 +158,7 @@ constexpr std::uint64_t kNotDigit = 0x80;
 /// may be marked too.
 constexpr std::uint64_t NotDigits(std::uint64_t bytes)
 {
-    return (bytes | (bytes + EightTimes(kNotDigit - 10))) & EightTimes(kNotDigit);
+    return (bytes | (bytes + RepeatByte(kNotDigit - 10))) & RepeatByte(kNotDigit);
 }
 
 /// The highest bit of each byte that is not a point, and any other bits. A slash behind a point is
@@ -167,14 +167,14 @@ constexpr std::uint64_t NotPoints(std::uint64_t bytes)
 {
     // The sum is the byte's negative, with the highest bit for 1 to 128. It carries out of a point
     // only, which makes a negative of 0 for the slash: that is 1 here.
-    const auto others = bytes ^ EightTimes('.' ^ '0');
-    return others | (~others + EightTimes(1));
+    const auto others = bytes ^ RepeatByte('.' ^ '0');
+    return others | (~others + RepeatByte(1));
 }
 
 /// Whether bytes that are digits or points are all digits.
 constexpr bool AreDigits(std::uint64_t bytes)
 {
-    return (bytes & EightTimes(('.' ^ '0') & 0xF0)) == 0;
+    return (bytes & RepeatByte(('.' ^ '0') & 0xF0)) == 0;
 }
 
 /// The number whose digits are the bytes 0 to 9 of a word, the first in the lowest byte.

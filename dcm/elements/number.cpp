@@ -1,8 +1,8 @@
 #include "dcm/elements/number.h"
 
 #include "dcm/elements/decimal.h"
-#include "dcm/platform/codepage.h"
 #include "dcm/platform/text.h"
+#include "dcm/platform/word.h"
 
 #include <algorithm>
 #include <array>
@@ -175,7 +175,7 @@ inline const char* TakeDigits(const char* at, std::uint64_t& number)
         const auto others = NotDigits(bytes);
         if (others != 0) {
             // No branch on the count, which changes from number to number.
-            const auto size = FirstByte(others);
+            const auto size = LowestByteSet(others);
             number = number * kTens[size] + JoinEight(bytes << 8 << (56 - 8 * size));
             return at + size;
         }
@@ -230,7 +230,7 @@ inline const char* TakeLong(const char* at, std::uint64_t bytes, std::uint64_t o
     if (!fits || !AreDigits(digits)) {
         return nullptr;
     }
-    decimal.exponent = static_cast<int>(FirstByte(others)) - 7 - static_cast<int>(count);
+    decimal.exponent = static_cast<int>(LowestByteSet(others)) - 7 - static_cast<int>(count);
     return end;
 }
 
@@ -245,8 +245,8 @@ inline const char* TakeFixed(const char* at, Decimal& decimal)
         return TakeLong(at, bytes, others, decimal);
     }
     // No branch on where the point is and how long the number: that changes from one to the next.
-    const auto size = FirstByte(ends);
-    const auto whole = FirstByte(others) + 1;
+    const auto size = LowestByteSet(ends);
+    const auto whole = LowestByteSet(others) + 1;
     const auto last = std::max(size, whole);
     const auto digits = WithoutPoint(bytes, others) << ((64 - 8 * last) % 64);
     if (last == 1 || !AreDigits(digits)) {
@@ -317,7 +317,7 @@ char* WriteNumber(double value, int digits, char* to) noexcept
     const auto first = static_cast<char>('0' + whole / kTenTo16);
     const auto upper = SplitEight(whole % kTenTo16 / kTenTo8);
     const auto lower = SplitEight(whole % kTenTo8);
-    const auto others = (uint128{lower | EightTimes('0')} << 64) | (upper | EightTimes('0'));
+    const auto others = (uint128{lower | RepeatByte('0')} << 64) | (upper | RepeatByte('0'));
     // The last digit that is not 0, found without a branch: long and short numbers come mixed.
     const auto used = lower != 0 ? ~std::uint64_t{0} : 0;
     const int count =

@@ -3,6 +3,7 @@
 #include "dcm/elements/block_lines.h"
 #include "dcm/elements/number.h"
 #include "dcm/platform/text.h"
+#include "dcm/platform/word.h"
 
 #include <algorithm>
 #include <array>
@@ -112,7 +113,7 @@ bool PointReader::Read(const BlockLine& line)
     if (size == 0 || size > sizeof(std::uint64_t))
         return false;
     const std::uint64_t all = ~std::uint64_t{0} >> (64 - 8 * size);
-    const Line found = {size, EightCharacters(line.keyword.data()) & all};
+    const Line found = {size, LoadWord(line.keyword.data()) & all};
     if (!found.HasKeywordOf(*m_last)) {
         std::swap(m_last, m_other);
         if (!found.HasKeywordOf(*m_last)) {

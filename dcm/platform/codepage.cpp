@@ -3,6 +3,7 @@
 #include "dcm/platform/code_page_system.h"
 #include "dcm/platform/file_text_builder.h"
 #include "dcm/platform/text.h"
+#include "dcm/platform/word.h"
 
 #include <algorithm>
 #include <array>
@@ -350,9 +351,8 @@ wchar_t* WidenWide(std::string_view bytes, wchar_t* to)
 std::uint8_t PlaceOf(std::string_view bytes)
 {
     const std::size_t size = std::min(bytes.size(), std::size_t{8});
-    const std::uint64_t first = EightCharacters(bytes.data()) << (64 - 8 * size);
-    const std::uint64_t last = EightCharacters(bytes.data() + bytes.size() - size)
-                               << (64 - 8 * size);
+    const std::uint64_t first = LoadWord(bytes.data()) << (64 - 8 * size);
+    const std::uint64_t last = LoadWord(bytes.data() + bytes.size() - size) << (64 - 8 * size);
     constexpr std::uint64_t factor = 0x9E37'79B9'7F4A'7C15;
     return static_cast<std::uint8_t>(((first + bytes.size()) * factor ^ last) * factor >> 56);
 }

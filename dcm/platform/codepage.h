@@ -2,6 +2,7 @@
 
 #include "dcm/library/export.h"
 #include "dcm/platform/cstring.h"
+#include "dcm/platform/word.h"
 
 #include <array>
 #include <cstddef>
@@ -35,10 +36,6 @@ enum class Encoding : unsigned char
     /// need not be Unicode.
     kWide,
 };
-
-/// Bytes behind the text of a file that may be read, so that code which looks at eight bytes at a
-/// time need not look for the end first.
-inline constexpr std::size_t kReadAhead = 8;
 
 struct FileText;
 

@@ -1,14 +1,14 @@
 #pragma once
 
+#include "dcm/platform/word.h"
+
 #include <algorithm>
-#include <bit>
 #include <cstddef>
 #include <cstdint>
-#include <cstring>
 #include <string_view>
 
-/// What white space and letter case mean in this format. All that they concern is ASCII, so that
-/// text is cut and compared as it stands in its file.
+/// What white space and letter case mean in this format. Both concern ASCII only, so the bytes of a
+/// file are trimmed and compared without being converted.
 namespace dcm {
 
 /// White space is U+0009 to U+000D and U+0020, whatever the locale.
@@ -17,42 +17,17 @@ constexpr bool IsWhite(char c)
     return c <= ' ' && (c == ' ' || (c >= '\t' && c <= '\r'));
 }
 
-/// The eight characters at `at` in the bytes of a word, the first in the lowest.
-inline std::uint64_t EightCharacters(const char* at)
-{
-    std::uint64_t text = 0;
-    if constexpr (std::endian::native == std::endian::little) {
-        std::memcpy(&text, at, sizeof text);
-    } else {
-        for (int i = 0; i < 8; ++i)
-            text |= std::uint64_t{static_cast<unsigned char>(at[i])} << (8 * i);
-    }
-    return text;
-}
-
-/// Eight times the byte `value`.
-constexpr std::uint64_t EightTimes(unsigned char value)
-{
-    return value * std::uint64_t{0x0101'0101'0101'0101};
-}
-
-/// The place of the lowest byte of `word`, which is not zero, with a bit that is set.
-inline std::size_t FirstByte(std::uint64_t word)
-{
-    return static_cast<std::size_t>(std::countr_zero(word)) / 8;
-}
-
-/// Where the white space at `at` is over, `end` at the latest. Eight characters behind `end` may be
-/// looked at.
+/// The first character at or after `at` that is not white space, or `end`. `kReadAhead` characters
+/// after `end` must be readable.
 inline const char* SkipWhite(const char* at, const char* end)
 {
     while (at < end) {
-        const std::uint64_t others = EightCharacters(at) ^ EightTimes(' ');
+        const std::uint64_t others = LoadWord(at) ^ RepeatByte(' ');
         if (others == 0) {
             at += 8;
             continue;
         }
-        at += FirstByte(others);
+        at += LowestByteSet(others);
         if (!IsWhite(*at))
             break;
         ++at;

@@ -1,0 +1,40 @@
+#pragma once
+
+#include <bit>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+
+/// Looking at eight characters at a time, as the bytes of one word.
+namespace dcm {
+
+/// How many bytes must be readable after a text, so that code that loads eight bytes at a time need
+/// not check for the end first.
+inline constexpr std::size_t kReadAhead = 8;
+
+/// The eight characters at `at` as the bytes of a word, the first in the lowest byte.
+inline std::uint64_t LoadWord(const char* at)
+{
+    std::uint64_t text = 0;
+    if constexpr (std::endian::native == std::endian::little) {
+        std::memcpy(&text, at, sizeof text);
+    } else {
+        for (int i = 0; i < 8; ++i)
+            text |= std::uint64_t{static_cast<unsigned char>(at[i])} << (8 * i);
+    }
+    return text;
+}
+
+/// A word of eight bytes, each of them `value`.
+constexpr std::uint64_t RepeatByte(unsigned char value)
+{
+    return value * std::uint64_t{0x0101'0101'0101'0101};
+}
+
+/// The index of the lowest byte of `word` that has a bit set. `word` must not be zero.
+inline std::size_t LowestByteSet(std::uint64_t word)
+{
+    return static_cast<std::size_t>(std::countr_zero(word)) / 8;
+}
+
+} // namespace dcm
