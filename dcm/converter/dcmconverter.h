@@ -36,9 +36,9 @@ public:
 
     /// Reads a DCM file and adds its blocks, in the order of the file, to those already held.
     /// Blocks of unknown kinds, and a last block that no empty line follows, are skipped. Returns
-    /// 0, or `E_UNEXPECTED` when the file cannot be opened or read, a block is beyond reading (a
-    /// FESTWERTEBLOCK with an empty WERT line) or memory runs out; the blocks read until then
-    /// stay. Throws nothing.
+    /// 0, or `E_UNEXPECTED` when the file cannot be opened or read, memory runs out, or a
+    /// FESTWERTEBLOCK has a line with nothing but blanks and double quotes, or tabs around them,
+    /// after `WERT` and a blank. The blocks read before that stay. Throws nothing.
     HRESULT Import(const CString& strPath);
 
     /// Writes the header text, the format version 2.0 and all blocks, kind after kind. An existing
