@@ -1,7 +1,7 @@
 # Debian packages by CPack: libdcm1 to run hosts, libdcm-dev to build them. The Debian revision and
 # the packager's address may be set; scripts/package builds and checks them.
 set(DCM_DEBIAN_REVISION 1 CACHE STRING "Revision of the Debian packages")
-set(DCM_DEBIAN_MAINTAINER "The dcm authors <dcm@dcm.invalid>" CACHE STRING
+set(DCM_DEBIAN_MAINTAINER "The dcm project <dcm@dcm.invalid>" CACHE STRING
     "Who answers for the Debian packages")
 
 include(GNUInstallDirs)
@@ -51,9 +51,16 @@ execute_process(COMMAND gzip -9nc ${documents}/changelog.Debian
     OUTPUT_FILE ${documents}/changelog.Debian.gz COMMAND_ERROR_IS_FATAL ANY)
 execute_process(COMMAND gzip -9nc ${PROJECT_SOURCE_DIR}/CHANGELOG.md
     OUTPUT_FILE ${documents}/changelog.gz COMMAND_ERROR_IS_FATAL ANY)
+# The licence, without its title and its line of copyright, as a field of the copyright file.
+file(READ LICENSE license)
+string(REGEX REPLACE "^.*\n(Permission is .*)\n$" "\\1" license "${license}")
+string(REPLACE "\n\n" "\n.\n" license "${license}")
+string(REPLACE "\n" "\n " license " ${license}")
+configure_file(cmake/debian/copyright.in ${documents}/copyright @ONLY)
 foreach(component Runtime Development)
     string(TOUPPER ${component} name)
-    install(FILES ${documents}/changelog.gz ${documents}/changelog.Debian.gz cmake/debian/copyright
+    install(FILES ${documents}/changelog.gz ${documents}/changelog.Debian.gz
+            ${documents}/copyright
         DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/${CPACK_DEBIAN_${name}_PACKAGE_NAME}
         COMPONENT ${component})
 endforeach()
