@@ -2,14 +2,18 @@
 
 #include <gtest/gtest.h>
 
+#include <array>
 #include <cerrno>
 #include <functional>
+#include <limits>
+#include <memory>
 #include <string_view>
 #include <tuple>
 
 #include <fcntl.h>
 #include <sys/file.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
 using namespace test;
@@ -30,6 +34,8 @@ struct Fault
 
 Fault fault;
 int calls = 0;
+/// Whether writing only looks as if it had happened.
+bool writesNothing = false;
 
 /// The count of bytes that may be transferred; negative when the call fails.
 ssize_t Room(std::string_view call, std::size_t count)
@@ -59,8 +65,14 @@ DCM_TEST_WRAP(int, flock, 0, (int file, int operation), (file, operation))
 DCM_TEST_WRAP(int, ftruncate, 0, (int file, off_t length), (file, length))
 DCM_TEST_WRAP(ssize_t, read, count, (int file, void* to, std::size_t count),
               (file, to, static_cast<std::size_t>(room)))
-DCM_TEST_WRAP(ssize_t, write, count, (int file, const void* from, std::size_t count),
-              (file, from, static_cast<std::size_t>(room)))
+
+ssize_t __real_write(int file, const void* from, std::size_t count);
+ssize_t __wrap_write(int file, const void* from, std::size_t count)
+{
+    const ssize_t room = Room("write", count);
+    return room < 0 || writesNothing ? room
+                                     : __real_write(file, from, static_cast<std::size_t>(room));
+}
 
 int __real_close(int file);
 int __wrap_close(int file)
@@ -90,6 +102,41 @@ bool Under(const Fault& wanted, const std::function<void()>& operation)
 }
 
 constexpr HRESULT kFailed = E_UNEXPECTED;
+
+/// A child process: runs `operation` at its start and lives until the object goes.
+class Child
+{
+public:
+    explicit Child(const std::function<void()>& operation)
+    {
+        EXPECT_EQ(pipe(m_toChild.data()) + pipe(m_fromChild.data()), 0);
+        m_process = fork();
+        if (m_process == 0) {
+            operation();
+            char byte = 0;
+            close(m_toChild[1]);
+            _exit(write(m_fromChild[1], &byte, 1) == 1 && read(m_toChild[0], &byte, 1) == 0 ? 0
+                                                                                            : 1);
+        }
+        char byte = 1;
+        EXPECT_EQ(read(m_fromChild[0], &byte, 1), 1) << "the child has not started";
+    }
+    Child(const Child&) = delete;
+    Child& operator=(const Child&) = delete;
+    ~Child()
+    {
+        close(m_toChild[1]);
+        int status = 1;
+        EXPECT_EQ(waitpid(m_process, &status, 0), m_process);
+        EXPECT_EQ(status, 0);
+        for (const int file : {m_toChild[0], m_fromChild[0], m_fromChild[1]})
+            close(file);
+    }
+
+private:
+    std::array<int, 2> m_toChild{}, m_fromChild{};
+    pid_t m_process = 0;
+};
 
 } // namespace
 
@@ -175,6 +222,62 @@ TEST(LinuxFile, RefusesPipesAndWhatItMayNotOpen)
     WriteBytes(folder / L"large", "");
     std::filesystem::resize_file(PathOf(folder / L"large"), 1ULL << 34);
     EXPECT_EQ(CauseOf(folder / L"large", kRead), CFileException::fileTooLarge);
+}
+
+TEST(LinuxFile, IsFreeAfterItsCloseWhileAChildLives)
+{
+    const Folder folder;
+    const CString path = folder / L"file";
+    WriteBytes(path, "kept");
+    for (const bool byDestructor : {false, true}) {
+        auto file = std::make_unique<CFile>(path, kRead);
+        const Child child([] {});
+        EXPECT_EQ(CauseOf(path, kRead), CFileException::sharingViolation);
+        byDestructor ? file.reset() : file->Close();
+        EXPECT_EQ(CauseOf(path, kRead), CFileException::none) << byDestructor;
+    }
+    // What the child closes stays the parent's.
+    CFile file(path, kRead);
+    const Child child([&] { file.Close(); });
+    EXPECT_EQ(CauseOf(path, kCreate), CFileException::sharingViolation);
+    EXPECT_EQ(ReadBytes(path), "kept");
+}
+
+TEST(LinuxFile, StaysBelow2GiB)
+{
+    const Folder folder;
+    const CString path = folder / L"file";
+    PravFile file(path, kCreate);
+    const char byte = 'x';
+    writesNothing = true;
+    file.Write(&byte, std::numeric_limits<std::int32_t>::max() - 8);
+    file.WriteText(L"a\n");
+    EXPECT_THROW(DCMFestwert().Export(file), CFileException);
+    file.Write("12345", 5);
+    try {
+        file.Write(&byte, 1);
+        ADD_FAILURE() << "written";
+    } catch (const CFileException& error) {
+        EXPECT_EQ(error.m_cause, CFileException::fileTooLarge);
+        EXPECT_EQ(error.m_strFileName, path);
+    }
+    writesNothing = false;
+}
+
+TEST(LinuxFile, ReportsThatTheFileBeforeCouldNotBeClosed)
+{
+    const Folder folder;
+    CFile file(folder / L"before", kCreate);
+    for (CFileException error;
+         CFileException * record : {&error, static_cast<CFileException*>(nullptr)}) {
+        EXPECT_TRUE(file.Open(folder / L"before", kCreate));
+        EXPECT_TRUE(Under({"close", 1, EIO}, [&] {
+            EXPECT_FALSE(file.Open(folder / L"next", kCreate, record));
+            EXPECT_TRUE(error.m_cause == CFileException::hardIO && error.m_lOsError == EIO);
+            EXPECT_EQ(error.m_strFileName, folder / L"before");
+            EXPECT_TRUE(file.Open(folder / L"before", kCreate)) << "for the count of open files";
+        }));
+    }
 }
 
 TEST(LinuxFile, ReportsAFullDevice)

@@ -132,6 +132,9 @@ TEST(File, KeepsOthersOutWhileItIsOpen)
             EXPECT_EQ(CauseOf(path, second), CFileException::sharingViolation) << second;
             // What was refused neither emptied the file nor took it from its holder.
             EXPECT_EQ(holder.GetLength(), 4U);
+            CFileException error;
+            EXPECT_FALSE(CFile().Open(path, second, &error));
+            EXPECT_NE(std::string(error.what()).find("has the file open"), std::string::npos);
         }
     }
 }
@@ -145,8 +148,11 @@ TEST(File, SaysWhyItCannotBeOpened)
     EXPECT_EQ(CauseOf(large, kRead), CFileException::none);
     std::filesystem::resize_file(PathOf(large), 1ULL << 31);
     EXPECT_EQ(CauseOf(large, kRead), CFileException::fileTooLarge);
-    EXPECT_EQ(CauseOf(large, kCreate), CFileException::fileTooLarge);
+    EXPECT_EQ(CauseOf(large, CFile::modeCreate), CFileException::fileTooLarge);
+    EXPECT_EQ(CauseOf(large, CFile::modeWrite), CFileException::fileTooLarge);
     EXPECT_EQ(std::filesystem::file_size(PathOf(large)), 1ULL << 31);
+    ASSERT_EQ(DCMConverter().Export(large), S_OK) << "what is emptied may have any size";
+    EXPECT_EQ(ReadBytes(large), ExportBytes(DCMConverter()));
     EXPECT_EQ(CauseOf(folder / L"missing", CFile::modeWrite), CFileException::fileNotFound);
     EXPECT_EQ(CauseOf(folder / L"", kCreate), CFileException::accessDenied);
     EXPECT_NE(CauseOf(L"", kRead), CFileException::none);
@@ -181,6 +187,11 @@ TEST(File, ReadsAndWritesWhatItsFlagsSay)
     EXPECT_FALSE(file.GetStatus(status));
     EXPECT_THROW(file.GetLength(), CFileException);
     EXPECT_THROW(file.Write(bytes, 1), CFileException);
+    WriteBytes(path, "kept");
+    EXPECT_TRUE(file.Open(path, CFile::modeCreate));
+    EXPECT_EQ(file.Read(bytes, 8), 4U) << "a file that is only read is not emptied";
+    EXPECT_TRUE(file.Open(folder / L"new", CFile::modeCreate));
+    EXPECT_EQ(file.Read(bytes, 8), 0U);
 }
 
 TEST(Modules, StandInTheListWhileTheyAreLoaded)

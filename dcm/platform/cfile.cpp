@@ -12,6 +12,9 @@ std::string Describe(CFileException::Cause cause, long osError, const CString& f
 {
     std::string text = dcm::ToUtf8(fileName);
     text += ": ";
+    // The system's words, such as "resource temporarily unavailable", do not tell what to do.
+    if (cause == CFileException::sharingViolation)
+        return text += "another program or document has the file open";
     if (osError != 0)
         return text += std::system_category().message(static_cast<int>(osError));
     switch (cause) {
@@ -53,30 +56,40 @@ CFile::CFile(const CString& path, UINT flags) : CFile()
 CFile::~CFile()
 {
     if (m_handle != dcm::system::kNoFile)
-        dcm::system::CloseFile(m_handle);
+        CloseHandle();
 }
 
 BOOL CFile::Open(const wchar_t* path, UINT flags, CFileException* error)
 {
-    Close();
+    try {
+        Close();
+    } catch (const CFileException& failure) {
+        if (error != nullptr)
+            *error = failure;
+        return 0;
+    }
     m_strFileName = CString(path);
     long osError = 0;
     CFileException::Cause refusal = CFileException::none;
     m_handle = dcm::system::OpenFile(m_strFileName, flags, osError, refusal);
-    if (m_handle != dcm::system::kNoFile)
-        return TRUE;
+    if (m_handle != dcm::system::kNoFile) {
+        m_position = 0;
+        m_process = dcm::system::ProcessNumber();
+        return 1;
+    }
     if (error != nullptr) {
-        const auto cause = osError != 0 ? dcm::system::CauseOf(osError) : refusal;
+        const auto cause =
+            refusal != CFileException::none ? refusal : dcm::system::CauseOf(osError);
         *error = CFileException(cause, osError, m_strFileName);
     }
-    return FALSE;
+    return 0;
 }
 
 BOOL CFile::GetStatus(CFileStatus& status) const
 {
     const bool known =
         m_handle != dcm::system::kNoFile && dcm::system::FileLength(m_handle, status.m_size) == 0;
-    return known ? TRUE : FALSE;
+    return known ? 1 : 0;
 }
 
 ULONGLONG CFile::GetLength() const
@@ -102,6 +115,7 @@ UINT CFile::Read(void* buffer, UINT count)
         if (done == 0)
             break;
         total += done;
+        m_position += done;
     }
     return static_cast<UINT>(total);
 }
@@ -110,6 +124,8 @@ void CFile::Write(const void* buffer, UINT count)
 {
     if (m_handle == dcm::system::kNoFile)
         Throw(0);
+    if (m_position + count >= dcm::system::kSizeLimit)
+        throw CFileException(CFileException::fileTooLarge, 0, m_strFileName);
     const auto* const bytes = static_cast<const char*>(buffer);
     std::size_t total = 0;
     while (total < count) {
@@ -119,6 +135,7 @@ void CFile::Write(const void* buffer, UINT count)
         if (done == 0)
             throw CFileException(CFileException::diskFull, 0, m_strFileName);
         total += done;
+        m_position += done;
     }
 }
 
@@ -126,10 +143,16 @@ void CFile::Close()
 {
     if (m_handle == dcm::system::kNoFile)
         return;
+    if (const long error = CloseHandle())
+        Throw(error);
+}
+
+long CFile::CloseHandle() noexcept
+{
     const auto handle = m_handle;
     m_handle = dcm::system::kNoFile;
-    if (const long error = dcm::system::CloseFile(handle))
-        Throw(error);
+    // A forked child leaves the file to its parent.
+    return dcm::system::CloseFile(handle, dcm::system::ProcessNumber() == m_process);
 }
 
 void CFile::Throw(long osError) const

@@ -7,31 +7,42 @@
 #include <cstddef>
 #include <cstdint>
 
-/// The file calls of the system. None of them throws but for want of memory; each reports an error
-/// by the system's number, 0 for none.
+/// The file calls of the system. They throw only `std::bad_alloc`. Each reports an error by the
+/// system's number, 0 for none.
 namespace dcm::system {
 
 using FileHandle = std::intptr_t;
 inline constexpr FileHandle kNoFile = -1;
 
-/// Opens a file for exclusive use, by the flags of `CFile`. `refusal` tells what a failure without
-/// an error number means. Returns `kNoFile` on a failure, which leaves an existing file as it was.
+/// A file of this many bytes or more is not read, and no write makes a file that large.
+inline constexpr std::uint64_t kSizeLimit = std::uint64_t{1} << 31;
+
+/// Opens a file for exclusive use, by the flags of `CFile`. Returns `kNoFile` on a failure, which
+/// leaves an existing file as it was. `refusal` is then the cause of a failure that the error
+/// number does not tell, otherwise it is not changed.
 FileHandle OpenFile(const CString& path, UINT flags, long& error, CFileException::Cause& refusal);
 
+/// The number of this process. A forked child shares the open files of its parent.
+long ProcessNumber() noexcept;
+
+/// The length of an open file in bytes; 0 for a device.
 long FileLength(FileHandle file, std::uint64_t& length) noexcept;
 
-/// Reads what the system hands out at once, at least a byte unless the file ends here.
+/// Reads up to `count` bytes; `done` is how many the system gave, 0 only at the end of the file.
 long ReadSome(FileHandle file, void* buffer, std::size_t count, std::size_t& done) noexcept;
 
-/// Writes what the system takes at once.
+/// Writes up to `count` bytes; `done` is how many the system took.
 long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size_t& done) noexcept;
 
-/// Says that memory is about to be filled as a whole. Where the system can, it comes in large pages
-/// then, each of which costs one fault; where it cannot, nothing changes.
+/// Announces that all of this memory is about to be filled. Where the system can, it then comes in
+/// large pages, each of which costs one page fault; elsewhere nothing changes.
 void ExpectToFill(void* memory, std::size_t size) noexcept;
 
-long CloseFile(FileHandle file) noexcept;
+/// Closes a file. With `endUse` the exclusive use ends, even while child processes have the file
+/// open too; without, it lasts until every process has closed the file.
+long CloseFile(FileHandle file, bool endUse) noexcept;
 
+/// The cause that an error number means; `generic` for most.
 CFileException::Cause CauseOf(long error) noexcept;
 
 } // namespace dcm::system

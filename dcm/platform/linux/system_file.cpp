@@ -14,9 +14,7 @@ namespace dcm::system {
 
 namespace {
 
-constexpr off_t kTooLarge = off_t{1} << 31;
-
-/// Closes the file again unless opening it came to a good end.
+/// Closes the file unless it is released.
 class OpeningFile
 {
 public:
@@ -26,7 +24,7 @@ public:
     ~OpeningFile()
     {
         if (m_file >= 0)
-            close(m_file);
+            CloseFile(m_file, true);
     }
 
     int Get() const { return m_file; }
@@ -41,8 +39,8 @@ private:
     int m_file;
 };
 
-/// Locks the whole file without waiting. Where the file system has no such locks, the file is used
-/// without one.
+/// Locks the whole file without waiting. Returns false when somebody else has locked it. Where the
+/// file system has no such locks, the file is used without one.
 bool Lock(int file)
 {
     while (flock(file, LOCK_EX | LOCK_NB) != 0) {
@@ -80,20 +78,27 @@ FileHandle OpenFile(const CString& path, UINT flags, long& error, CFileException
         refusal = CFileException::accessDenied;
         return kNoFile;
     }
-    if (status.st_size >= kTooLarge) {
+    const bool emptied = creation != 0 && access != O_RDONLY;
+    if (!emptied && static_cast<std::uint64_t>(status.st_size) >= kSizeLimit) {
         refusal = CFileException::fileTooLarge;
         return kNoFile;
     }
     if (!Lock(file.Get())) {
         error = EWOULDBLOCK;
+        refusal = CFileException::sharingViolation;
         return kNoFile;
     }
     // Only now: a file that somebody else uses keeps its content.
-    if (creation != 0 && access != O_RDONLY && ftruncate(file.Get(), 0) != 0) {
+    if (emptied && ftruncate(file.Get(), 0) != 0) {
         error = errno;
         return kNoFile;
     }
     return file.Release();
+}
+
+long ProcessNumber() noexcept
+{
+    return getpid();
 }
 
 long FileLength(FileHandle file, std::uint64_t& length) noexcept
@@ -139,10 +144,15 @@ void ExpectToFill(void* memory, std::size_t size) noexcept
         ::madvise(memory, size / page * page, MADV_HUGEPAGE); // Only a hint.
 }
 
-long CloseFile(FileHandle file) noexcept
+long CloseFile(FileHandle file, bool endUse) noexcept
 {
+    const int number = static_cast<int>(file);
+    // Closing ends the lock only when no child has the file open. A device has no lock to end, nor
+    // have some file systems: no error.
+    if (endUse)
+        flock(number, LOCK_UN);
     // After an interrupted close the file is closed all the same.
-    return close(static_cast<int>(file)) == 0 || errno == EINTR ? 0 : errno;
+    return close(number) == 0 || errno == EINTR ? 0 : errno;
 }
 
 CFileException::Cause CauseOf(long error) noexcept
@@ -167,8 +177,6 @@ CFileException::Cause CauseOf(long error) noexcept
         return CFileException::invalidFile;
     case EIO:
         return CFileException::hardIO;
-    case EWOULDBLOCK:
-        return CFileException::sharingViolation;
     case ENOSPC:
     case EDQUOT:
         return CFileException::diskFull;

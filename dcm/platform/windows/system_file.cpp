@@ -6,9 +6,7 @@ namespace dcm::system {
 
 namespace {
 
-constexpr LONGLONG kTooLarge = LONGLONG{1} << 31;
-
-/// As many bytes as one call to the system moves at most.
+/// How many bytes one call to the system moves at most.
 constexpr std::size_t kMostAtOnce = std::size_t{1} << 30;
 
 HANDLE HandleOf(FileHandle file)
@@ -21,7 +19,7 @@ long LastError()
     return static_cast<long>(GetLastError());
 }
 
-/// Closes the file again unless opening it came to a good end.
+/// Closes the file unless it is released.
 class OpeningFile
 {
 public:
@@ -75,16 +73,22 @@ FileHandle OpenFile(const CString& path, UINT flags, long& error, CFileException
         error = LastError();
         return kNoFile;
     }
-    if (length.QuadPart >= kTooLarge) {
+    const bool emptied = create && (access & GENERIC_WRITE) != 0;
+    if (!emptied && static_cast<std::uint64_t>(length.QuadPart) >= kSizeLimit) {
         refusal = CFileException::fileTooLarge;
         return kNoFile;
     }
     // Only now: a file that is refused keeps its content.
-    if (create && (access & GENERIC_WRITE) != 0 && !SetEndOfFile(file.Get())) {
+    if (emptied && !SetEndOfFile(file.Get())) {
         error = LastError();
         return kNoFile;
     }
     return file.Release();
+}
+
+long ProcessNumber() noexcept
+{
+    return static_cast<long>(GetCurrentProcessId());
 }
 
 long FileLength(FileHandle file, std::uint64_t& length) noexcept
@@ -123,8 +127,9 @@ long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size
 void ExpectToFill(void*, std::size_t) noexcept
 {}
 
-long CloseFile(FileHandle file) noexcept
+long CloseFile(FileHandle file, bool /*endUse*/) noexcept
 {
+    // A child process does not get the handle.
     return CloseHandle(HandleOf(file)) ? 0 : LastError();
 }
 
