@@ -4,6 +4,7 @@
 #include "dcm/elements/block_text.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
+#include "dcm/elements/variant_number.h"
 #include "dcm/platform/text.h"
 #include "dcm/textfile/pravfile.h"
 
@@ -14,39 +15,6 @@ namespace {
 /// A text on its own line has nothing behind its closing quote.
 constexpr dcm::TextItemStyle kSingleText = {L"\n\r", L""};
 
-/// The number that a value stands for; 0.0 when it stands for none.
-double NumberOf(const VARIANT& value)
-{
-    switch (value.vt) {
-    case VT_R8:
-        return value.dblVal;
-    case VT_R4:
-        return static_cast<double>(value.fltVal);
-    case VT_BOOL:
-        return value.boolVal != VARIANT_FALSE ? 1.0 : 0.0;
-    case VT_I1:
-        return static_cast<signed char>(value.cVal);
-    case VT_UI1:
-        return value.bVal;
-    case VT_I2:
-        return value.iVal;
-    case VT_UI2:
-        return value.uiVal;
-    case VT_I4:
-    case VT_INT:
-        return value.lVal;
-    case VT_UI4:
-    case VT_UINT:
-        return value.ulVal;
-    case VT_I8:
-        return static_cast<double>(value.llVal);
-    case VT_UI8:
-        return static_cast<double>(value.ullVal);
-    default:
-        return 0.0;
-    }
-}
-
 void AppendValueLine(dcm::FileTextBuilder& block, const VARIANT& value)
 {
     if (value.vt == VT_BSTR) {
@@ -54,8 +22,9 @@ void AppendValueLine(dcm::FileTextBuilder& block, const VARIANT& value)
         dcm::AppendQuotedText(block, CComVariant::TextOf(value), kSingleText);
     } else {
         dcm::BeginLine(block, dcm::keyword::kWert);
+        const double number = dcm::NumberOf(value).value_or(0.0);
         char* const to = block.Extend(dcm::kNumberTextMax);
-        block.EndExtend(dcm::WriteNumber(NumberOf(value), dcm::kFullDigits, to));
+        block.EndExtend(dcm::WriteNumber(number, dcm::kFullDigits, to));
     }
     block.EndLine();
 }
