@@ -8,7 +8,7 @@ using namespace test;
 
 namespace {
 
-/// Those of the fields that are not empty, each behind its label.
+/// Those of the fields that are not empty, each after its label.
 template <class Value, class... Rest>
 std::string Fields(const char* label, const Value& value, const Rest&... rest)
 {
@@ -65,6 +65,8 @@ std::string Describe(const DCMKennfeld& b)
 struct Case
 {
     std::string title, input, fields, written;
+    /// The line of the title.
+    int line = 0;
 };
 
 template <class Block>
@@ -88,10 +90,10 @@ void Check(const Case& expected)
     }
 }
 
-/// Checks a case for each kind that is named in front of the colon in its title.
-void CheckKinds(const Case& expected)
+/// Checks a case of a file for each kind that is named before the colon in its title.
+void CheckKinds(const Case& expected, const std::string& file)
 {
-    SCOPED_TRACE(expected.title);
+    const testing::ScopedTrace trace(file.c_str(), expected.line, expected.title);
     const std::string kinds = " " + expected.title.substr(0, expected.title.find(':')) + " ";
     bool known = false;
     ForEachKind([&](const std::string& keyword, auto get, auto) {
@@ -109,10 +111,12 @@ TEST(Blocks, ReadAndWriteAsTheirCasesSay)
 {
     int cases = 0;
     for (const std::string kinds : {"attributes", "festwert", "festwerteblock", "points"}) {
-        const std::string text = ReadBytes(dcm::Widen(DCM_TEST_DATA "/blocks/" + kinds + ".txt"));
-        std::istringstream lines(Unmarked(text) + "\n");
+        const std::string file = DCM_TEST_DATA "/blocks/" + kinds + ".txt";
+        std::istringstream lines(Unmarked(ReadBytes(dcm::Widen(file))) + "\n");
         Case now;
+        int number = 0;
         for (std::string line; std::getline(lines, line);) {
+            ++number;
             const std::string content = line.substr(std::min<std::size_t>(line.size(), 2));
             if (line.starts_with("  ")) {
                 now.input += content + "\n";
@@ -122,8 +126,9 @@ TEST(Blocks, ReadAndWriteAsTheirCasesSay)
                 now.fields = line.substr(1);
             } else if (!line.empty() && line[0] != '#') {
                 now.title = line;
+                now.line = number;
             } else if (!now.title.empty()) {
-                CheckKinds(now);
+                CheckKinds(now, file);
                 ++cases;
                 now = {};
             }
