@@ -1,5 +1,6 @@
 #include "dcm/converter/dcmconverter.h"
 
+#include "dcm/converter/document_io.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/platform/file_text_builder.h"
 #include "dcm/platform/text.h"
@@ -58,15 +59,28 @@ DCMConverter::~DCMConverter() = default;
 HRESULT DCMConverter::Import(const CString& strPath)
 {
     try {
-        PravFile file(strPath, CFile::modeRead);
-        m_bBlockSeen = 0;
-        HRESULT result = S_OK;
-        while (file.ReadBlock())
-            result = AnalyzeToken(file.Block());
-        return result;
+        auto stage = dcm::FileStage::kOpening;
+        dcm::DocumentIo::Import(*this, strPath, stage, nullptr);
+        return S_OK;
     } catch (...) {
         return E_UNEXPECTED;
     }
+}
+
+void dcm::DocumentIo::Import(DCMConverter& document, const CString& path, FileStage& stage,
+                             FindingList*)
+{
+    PravFile file;
+    CFileException error;
+    stage = FileStage::kOpening;
+    if (!file.CFile::Open(path, CFile::modeRead, &error))
+        throw CFileException(error);
+    stage = FileStage::kReading;
+    file.LoadContent(CFile::modeRead);
+    stage = FileStage::kBlocks;
+    document.m_bBlockSeen = 0;
+    while (file.ReadBlock())
+        document.AnalyzeToken(file.Block());
 }
 
 /// Takes what is in front of the first blank as the keyword of the block. No keyword goes beyond
@@ -245,21 +259,29 @@ HRESULT DCMConverter::AddTextstring(const DCMTextstring& block)
 HRESULT DCMConverter::Export(const CString& strPath) const
 {
     try {
-        PravFile file(strPath, CFile::modeCreate | CFile::modeWrite);
-        HRESULT result = S_OK;
-        CFileStatus status;
-        if (file.GetStatus(status)) {
-            // Every writer returns 0: what fails is thrown.
-            WriteHeader(file);
-            WriteFormat(file);
-            for (const BlockKind& kind : kBlockKinds)
-                result = (this->*kind.write)(file);
-            file.Close();
-        }
-        return result;
+        auto stage = dcm::FileStage::kOpening;
+        dcm::DocumentIo::Export(*this, strPath, stage, nullptr);
+        return S_OK;
     } catch (...) {
         return E_UNEXPECTED;
     }
+}
+
+void dcm::DocumentIo::Export(const DCMConverter& document, const CString& path, FileStage& stage,
+                             FindingList*)
+{
+    stage = FileStage::kOpening;
+    PravFile file(path, CFile::modeCreate | CFile::modeWrite);
+    stage = FileStage::kBlocks;
+    CFileStatus status;
+    if (!file.GetStatus(status))
+        return;
+    // Every writer returns 0: what fails is thrown.
+    document.WriteHeader(file);
+    document.WriteFormat(file);
+    for (const DCMConverter::BlockKind& kind : DCMConverter::kBlockKinds)
+        (document.*kind.write)(file);
+    file.Close();
 }
 
 HRESULT DCMConverter::WriteHeader(PravFile& file) const

@@ -16,6 +16,10 @@
 
 class PravFile;
 
+namespace dcm {
+struct DocumentIo;
+} // namespace dcm
+
 /// The document: the blocks of a DCM file, one list for each kind, with the text at the top of an
 /// exported file and the comment of an imported one.
 ///
@@ -84,6 +88,8 @@ public:
     std::list<DCMTextstring> GetTextstring() const { return m_listTextstring; }
 
 private:
+    friend struct dcm::DocumentIo;
+
     struct BlockKind;
     static const BlockKind kBlockKinds[];
 

@@ -13,6 +13,7 @@
 #include "dcm/elements/konservierungsformat.h"
 #include "dcm/elements/stuetzstellenverteilung.h"
 #include "dcm/library/export.h"
+#include "dcm/library/report.h"
 #include "dcm/library/version.h"
 #include "dcm/platform/automation.h"
 #include "dcm/platform/cfile.h"
@@ -21,4 +22,5 @@
 #include "dcm/platform/exception.h"
 #include "dcm/platform/module.h"
 #include "dcm/platform/variant.h"
+#include "dcm/textfile/finding.h"
 #include "dcm/textfile/pravfile.h"

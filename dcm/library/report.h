@@ -3,9 +3,10 @@
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
 #include "dcm/platform/cstring.h"
+#include "dcm/textfile/finding.h"
 
+#include <array>
 #include <cstddef>
-#include <cstdint>
 #include <memory>
 #include <span>
 #include <string_view>
@@ -18,35 +19,8 @@ class DCMConverter;
 
 namespace dcm {
 
-/// How much a finding matters.
-enum class Severity : unsigned char
-{
-    /// Something that the library does not keep or that may be meant so; no data are lost.
-    kNote,
-    /// Data are doubtful, or altered in a way that may matter.
-    kWarning,
-    /// Data are lost, or the work ended before its end.
-    kError,
-};
-
 /// L"note", L"warning" or L"error".
 DCM_API std::wstring_view NameOf(Severity severity) noexcept;
-
-/// One thing that an import or export met.
-struct Finding
-{
-    Severity severity;
-    /// What kind of finding it is, such as "unfinished-block"; the same in all later versions. The
-    /// text is never released. docs/findings.md tells of each.
-    std::string_view id;
-    /// The line in the file, from 1; 0 when the finding concerns no line of a file that is read.
-    std::int64_t line;
-    /// Keyword and name, such as "KENNFELD IgnMap"; empty outside of a block.
-    CString block;
-    /// One English sentence with the facts. It holds at most 200 characters of any text of the
-    /// file.
-    CString message;
-};
 
 /// All ids that a finding can have, in alphabetical order.
 DCM_API std::span<const std::string_view> FindingIds() noexcept;
@@ -87,8 +61,10 @@ private:
     struct Content;
 
     std::unique_ptr<Content> m_content;
+    /// By severity. Kept here, so that they are right when there is no memory for the content.
+    std::array<std::size_t, 3> m_counts{};
     std::size_t m_limit = 1000;
-    bool m_outOfMemory = false;
+    bool m_incomplete = false;
 };
 
 /// Does what `document.Import(path)` does, with the same result, and reports all that the file

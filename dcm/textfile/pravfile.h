@@ -9,6 +9,10 @@
 #include <cstdint>
 #include <string_view>
 
+namespace dcm {
+struct DocumentIo;
+} // namespace dcm
+
 /// A text file in the ANSI code page: read as a whole and handed out line by line, or written text
 /// by text with CR LF line ends.
 ///
@@ -45,6 +49,7 @@ protected:
 
 private:
     friend class DCMConverter;
+    friend struct dcm::DocumentIo;
 
     /// Takes the lines up to the next empty one; none where two empty lines meet. Returns false
     /// when no further empty line follows: what is left is dropped.

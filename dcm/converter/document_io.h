@@ -1,0 +1,30 @@
+#pragma once
+
+#include "dcm/converter/dcmconverter.h"
+#include "dcm/platform/cstring.h"
+#include "dcm/textfile/findings.h"
+
+/// Import and export of a document with what hosts do not see: how far they came, and why they
+/// failed.
+namespace dcm {
+
+/// How far an import or export has come.
+enum class FileStage : unsigned char
+{
+    kOpening,
+    /// The whole text of a file.
+    kReading,
+    kBlocks,
+};
+
+struct DocumentIo
+{
+    /// What the document's Import and Export do; failures are raised. `stage` tells how far it
+    /// came. Nothing is reported when `findings` is null.
+    static void Import(DCMConverter& document, const CString& path, FileStage& stage,
+                       FindingList* findings);
+    static void Export(const DCMConverter& document, const CString& path, FileStage& stage,
+                       FindingList* findings);
+};
+
+} // namespace dcm

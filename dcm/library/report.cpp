@@ -1,0 +1,253 @@
+#include "dcm/library/report.h"
+
+#include "dcm/converter/document_io.h"
+#include "dcm/platform/cfile.h"
+#include "dcm/platform/codepage.h"
+#include "dcm/platform/null_device.h"
+#include "dcm/textfile/findings.h"
+
+#include <algorithm>
+#include <new>
+#include <numeric>
+#include <string>
+#include <utility>
+
+namespace dcm {
+
+struct Report::Content
+{
+    FindingList findings;
+};
+
+/// Fills a report.
+struct ReportAccess
+{
+    static void Empty(Report& report) noexcept
+    {
+        report.m_content.reset();
+        report.m_counts = {};
+        report.m_incomplete = false;
+    }
+
+    /// The findings become the report's content. Without memory for them, only their counts do.
+    static void Set(Report& report, FindingList&& findings) noexcept
+    {
+        findings.Sort();
+        report.m_counts = findings.CountsBySeverity();
+        report.m_content.reset(new (std::nothrow) Report::Content{std::move(findings)});
+        report.m_incomplete = !report.m_content || report.m_content->findings.Incomplete();
+    }
+};
+
+namespace {
+
+/// What a file is opened for.
+enum class Direction : unsigned char
+{
+    kImport,
+    kExport,
+};
+
+std::wstring_view NameOf(CFileException::Cause cause)
+{
+    switch (cause) {
+    case CFileException::none:
+        return L"none";
+    case CFileException::generic:
+        return L"generic";
+    case CFileException::fileNotFound:
+        return L"fileNotFound";
+    case CFileException::badPath:
+        return L"badPath";
+    case CFileException::tooManyOpenFiles:
+        return L"tooManyOpenFiles";
+    case CFileException::accessDenied:
+        return L"accessDenied";
+    case CFileException::invalidFile:
+        return L"invalidFile";
+    case CFileException::hardIO:
+        return L"hardIO";
+    case CFileException::sharingViolation:
+        return L"sharingViolation";
+    case CFileException::diskFull:
+        return L"diskFull";
+    case CFileException::fileTooLarge:
+        return L"fileTooLarge";
+    }
+    return L"generic";
+}
+
+/// What the system says of a failure, with its cause by name.
+CString WordsOf(const CFileException& error) noexcept
+{
+    try {
+        CString words(L" (");
+        words.Append(NameOf(error.m_cause)).Append(L"): ");
+        return words.Append(FromUtf8(error.what())).Append(L".");
+    } catch (const std::bad_alloc&) {
+        return {};
+    }
+}
+
+void AddFileFailure(FindingList& findings, FileStage stage, Direction direction,
+                    const CFileException& error) noexcept
+{
+    const auto add = [&](FindingKind kind, std::wstring_view what) {
+        findings.Add(kind, Severity::kError, 0, {}, {what, WordsOf(error)});
+    };
+    if (stage == FileStage::kOpening)
+        add(FindingKind::kCannotOpen, L"The file cannot be opened");
+    else if (direction == Direction::kImport)
+        add(FindingKind::kCannotRead, L"The file cannot be read");
+    else
+        add(FindingKind::kCannotWrite, L"The file cannot be written");
+}
+
+/// Runs an import or export and reports the failure that ends it.
+template <class Work>
+HRESULT Run(FindingList& findings, Direction direction, Work work) noexcept
+{
+    auto stage = FileStage::kOpening;
+    try {
+        work(stage);
+        return S_OK;
+    } catch (const CFileException& error) {
+        AddFileFailure(findings, stage, direction, error);
+    } catch (const std::bad_alloc&) {
+        findings.Add(FindingKind::kOutOfMemory, Severity::kError, 0, {}, {L"Memory ran out."});
+    } catch (...) {
+        findings.Add(FindingKind::kStopped, Severity::kError, 0, {},
+                     {L"The import ended at this block."});
+    }
+    return E_UNEXPECTED;
+}
+
+} // namespace
+
+std::wstring_view NameOf(Severity severity) noexcept
+{
+    switch (severity) {
+    case Severity::kNote:
+        return L"note";
+    case Severity::kWarning:
+        return L"warning";
+    case Severity::kError:
+        break;
+    }
+    return L"error";
+}
+
+std::span<const std::string_view> FindingIds() noexcept
+{
+    return kFindingIds;
+}
+
+Report::Report() noexcept = default;
+
+Report::Report(const Report& other)
+    : m_content(other.m_content ? std::make_unique<Content>(*other.m_content) : nullptr),
+      m_counts(other.m_counts), m_limit(other.m_limit), m_incomplete(other.m_incomplete)
+{}
+
+Report::Report(Report&& other) noexcept : Report()
+{
+    *this = std::move(other);
+}
+
+Report& Report::operator=(const Report& other)
+{
+    Report copy(other);
+    return *this = std::move(copy);
+}
+
+Report& Report::operator=(Report&& other) noexcept
+{
+    m_content = std::exchange(other.m_content, nullptr);
+    m_counts = std::exchange(other.m_counts, {});
+    m_limit = other.m_limit;
+    m_incomplete = std::exchange(other.m_incomplete, false);
+    return *this;
+}
+
+Report::~Report() = default;
+
+const std::vector<Finding>& Report::Findings() const noexcept
+{
+    static constinit const std::vector<Finding> none;
+    return m_content ? m_content->findings.List() : none;
+}
+
+std::size_t Report::Count(Severity severity) const noexcept
+{
+    return m_counts[static_cast<std::size_t>(severity)];
+}
+
+std::size_t Report::Count(std::string_view id) const noexcept
+{
+    const auto* const found = std::ranges::lower_bound(kFindingIds, id);
+    if (!m_content || found == kFindingIds.end() || *found != id)
+        return 0;
+    return m_content->findings.Count(static_cast<FindingKind>(found - kFindingIds.begin()));
+}
+
+std::size_t Report::Count() const noexcept
+{
+    return std::accumulate(m_counts.begin(), m_counts.end(), std::size_t{0});
+}
+
+CString Report::Summary() const
+{
+    CString line;
+    for (const Severity severity : {Severity::kError, Severity::kWarning, Severity::kNote}) {
+        const std::size_t count = Count(severity);
+        if (count == 0)
+            continue;
+        line.Append(line.IsEmpty() ? L"" : L", ").Append(std::to_wstring(count)).Append(L" ");
+        line.Append(NameOf(severity)).Append(count == 1 ? L"" : L"s");
+    }
+    return line.IsEmpty() ? CString(L"no findings") : line;
+}
+
+void Report::SetLimit(std::size_t findingsPerId) noexcept
+{
+    m_limit = findingsPerId;
+}
+
+std::size_t Report::Limit() const noexcept
+{
+    return m_limit;
+}
+
+bool Report::Incomplete() const noexcept
+{
+    return m_incomplete;
+}
+
+HRESULT Import(DCMConverter& document, const CString& path, Report& report)
+{
+    ReportAccess::Empty(report);
+    FindingList findings(report.Limit());
+    const HRESULT result = Run(findings, Direction::kImport, [&](FileStage& stage) {
+        DocumentIo::Import(document, path, stage, &findings);
+    });
+    ReportAccess::Set(report, std::move(findings));
+    return result;
+}
+
+HRESULT Export(const DCMConverter& document, const CString& path, Report& report)
+{
+    ReportAccess::Empty(report);
+    FindingList findings(report.Limit());
+    const HRESULT result = Run(findings, Direction::kExport, [&](FileStage& stage) {
+        DocumentIo::Export(document, path, stage, &findings);
+    });
+    ReportAccess::Set(report, std::move(findings));
+    return result;
+}
+
+CString NullDevice()
+{
+    return CString(system::kNullDevice);
+}
+
+} // namespace dcm

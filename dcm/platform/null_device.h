@@ -1,0 +1,10 @@
+#pragma once
+
+#include <string_view>
+
+namespace dcm::system {
+
+/// The path of the device that takes whatever is written to it and keeps nothing.
+extern const std::wstring_view kNullDevice;
+
+} // namespace dcm::system
