@@ -22,6 +22,47 @@ VARIANT Tagged(VARTYPE tag)
 
 } // namespace
 
+TEST(Blocks, WriteWhatTheHostSets)
+{
+    ForEachKind([](const std::string& keyword, auto get, auto) {
+        SCOPED_TRACE(keyword);
+        BlockOf<decltype(get)> block;
+        constexpr bool kCurve = std::is_base_of_v<DCMKennlinie, decltype(block)>;
+        constexpr bool kMap = std::is_base_of_v<DCMKennfeld, decltype(block)>;
+        constexpr bool kAxis = std::is_base_of_v<DCMStuetzstellenverteilung, decltype(block)>;
+        block.SetName(L"n");
+        block.SetLangname(L"l");
+        block.SetDisplayname(L"d");
+        block.SetFunction(L"f");
+        std::string counts, units;
+        if constexpr (kCurve || kMap) {
+            block.SetUnit_X(L" ");
+            block.SetUnit_W(L" ");
+            block.SetAxisLenghtX(1);
+            counts = kMap ? " 1 1\n" : " 1\n";
+        } else {
+            block.SetUnit(L" ");
+        }
+        if constexpr (kMap) {
+            // A map without values is not written.
+            block.Init(L"ST/X 1 2\nST/Y 1 2\nWERT 1 2 3 4\n");
+            block.SetUnit_Y(L" ");
+            block.SetAxisLenghtY(1);
+        }
+        for (const auto& [written, line] :
+             {std::pair(kCurve || kMap || kAxis, "    EINHEIT_X \"\"\n"),
+              {kMap, "    EINHEIT_Y \"\"\n"},
+              {!kAxis, "    EINHEIT_W \"\"\n"}})
+            units += written ? line : "";
+        const std::string first = Written(block);
+        EXPECT_EQ(first.find(keyword + " n" + counts), 0U) << first;
+        EXPECT_NE(first.find("    LANGNAME \"l\"\n    DISPLAYNAME \"d\"\n    FUNKTION f\n" + units),
+                  first.npos)
+            << first;
+        EXPECT_EQ(Written(block), Replaced(first, units, "")) << "a unit of one blank counts once";
+    });
+}
+
 TEST(Festwert, WritesAValueOfAnyTag)
 {
     const std::tuple<CComVariant, VARTYPE, std::string> cases[] = {
@@ -153,9 +194,17 @@ TEST(Map, GivesItsPartsToAClassOfTheHost)
         using DCMKennfeld::AddValues, DCMKennfeld::ExportLangname, DCMKennfeld::ExportDisplayname;
         using DCMKennfeld::ExportFunktion, DCMKennfeld::ExportValues;
     } map;
+    PravFile file;
+    // More bytes than characters, in whatever code page.
+    for (const wchar_t* c : {L"\u00E4", L"\u20AC"}) {
+        CString name;
+        for (int i = 0; i < 2000; ++i)
+            name += c;
+        map.SetLangname(name);
+        EXPECT_EQ(map.ExportLangname(file), L"    LANGNAME \"" + name + L"\"\n");
+    }
     map.Init(L"LANGNAME l\nDISPLAYNAME d\nFUNKTION f\nST/X 1\nST/Y 1\n");
     EXPECT_EQ(map.AddValues(L"2", L"WERT"), S_OK);
-    PravFile file;
     EXPECT_EQ(map.ExportLangname(file) + map.ExportDisplayname(file) + map.ExportFunktion(file),
               L"    LANGNAME \"l\"\n    DISPLAYNAME \"d\"\n    FUNKTION f\n");
     EXPECT_EQ(map.ExportValues(file), L"    ST/X 1.0   \n    ST/Y 1.0   \n    WERT 2.0   \n");

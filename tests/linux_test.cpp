@@ -42,8 +42,10 @@ ssize_t Room(std::string_view call, std::size_t count)
 {
     if (call != fault.call || (++calls != fault.number && fault.number != 0))
         return static_cast<ssize_t>(count);
+    if (fault.error == 0)
+        return static_cast<ssize_t>(std::min(count, fault.most));
     errno = fault.error;
-    return fault.error != 0 ? -1 : static_cast<ssize_t>(std::min(count, fault.most));
+    return -1;
 }
 
 } // namespace
@@ -185,6 +187,55 @@ TEST(FileFault, OfEachCallIsReported)
     }
 }
 
+TEST(FileFault, HasACauseANumberAndWords)
+{
+    using File = CFileException;
+    const std::pair<File::Cause, std::vector<int>> cases[] = {
+        {File::fileNotFound, {ENOENT}},
+        {File::badPath, {ENOTDIR, ENAMETOOLONG, ELOOP}},
+        {File::tooManyOpenFiles, {EMFILE, ENFILE}},
+        {File::accessDenied, {EACCES, EPERM, EROFS, EISDIR, ETXTBSY}},
+        {File::invalidFile, {EBADF}},
+        {File::hardIO, {EIO}},
+        {File::diskFull, {ENOSPC, EDQUOT, 0}},
+        {File::fileTooLarge, {EFBIG, EOVERFLOW}},
+        {File::generic, {EINVAL}}};
+    const Folder folder;
+    const CString path = folder / L"file";
+    const auto check = [&](const Fault& one, File::Cause cause, const std::string& words) {
+        SCOPED_TRACE(one.call + (" " + words));
+        EXPECT_TRUE(Under(one, [&] {
+            try {
+                CFile file(path, CFile::modeCreate | CFile::modeReadWrite);
+                char byte = 0;
+                file.GetLength();
+                file.Read(&byte, 1);
+                errno = EIO; // Left from another call, it says nothing.
+                file.Write(&byte, 1);
+                file.Close();
+                ADD_FAILURE() << "not raised";
+            } catch (const CFileException& error) {
+                EXPECT_EQ(error.m_cause, cause);
+                EXPECT_EQ(error.m_lOsError, one.error);
+                EXPECT_EQ(error.m_strFileName, path);
+                EXPECT_EQ(error.what(), dcm::ToUtf8(path) + ": " + words);
+            }
+        }));
+    };
+    for (const auto& [cause, numbers] : cases) {
+        for (const int number : numbers) {
+            if (number == 0) {
+                check({"write", 1, 0, 0}, cause, "no room for all of the text");
+                continue;
+            }
+            // Opening a file asks for its status too.
+            const std::string words = std::system_category().message(number);
+            for (const char* call : {"open", "fstat", "read", "write", "close"})
+                check({call, call == std::string_view("fstat") ? 2 : 1, number}, cause, words);
+        }
+    }
+}
+
 TEST(FileFault, OfAnyWriteEndsTheExport)
 {
     const std::string bytes = ReadBytes(CString(DCM_ALL_KINDS));
@@ -278,6 +329,23 @@ TEST(LinuxFile, ReportsThatTheFileBeforeCouldNotBeClosed)
             EXPECT_TRUE(file.Open(folder / L"before", kCreate)) << "for the count of open files";
         }));
     }
+}
+
+TEST(LinuxFile, IsNotInheritedAndMayHaveAnyHandle)
+{
+    const Folder folder;
+    const int input = dup(STDIN_FILENO);
+    close(STDIN_FILENO);
+    CFile file(folder / L"file", kCreate);
+    EXPECT_EQ(fcntl(STDIN_FILENO, F_GETFD), FD_CLOEXEC);
+    CFileStatus status;
+    EXPECT_TRUE(file.GetStatus(status));
+    file.Write("a", 1);
+    EXPECT_EQ(file.GetLength(), 1U);
+    file.Close();
+    EXPECT_EQ(fcntl(STDIN_FILENO, F_GETFD), -1);
+    dup2(input, STDIN_FILENO);
+    close(input);
 }
 
 TEST(LinuxFile, ReportsAFullDevice)

@@ -82,6 +82,31 @@ TEST(Variant, RefusesTagsThatItDoesNotKnow)
     EXPECT_EQ(value.scode, DISP_E_BADVARTYPE);
 }
 
+TEST(Results, AreTheNumbersThatHostsKnow)
+{
+    VARIANT unknown{};
+    unknown.vt = 99;
+    const auto raised = [](const CString& text) {
+        try {
+            return static_cast<HRESULT>(text.GetAt(1));
+        } catch (const dcm::ResultError& error) {
+            return error.Code();
+        }
+    };
+    const std::pair<HRESULT, std::uint32_t> cases[] = {
+        {DCMFestwert().SetValue(CComVariant(1.0)), 0U},
+        {DCMConverter().Import(L"no such folder/a.dcm"), 0x8000FFFFU},
+        {DCMFestwert().GetValue(nullptr), 0x80004003U},
+        {DCMKennlinie().Init(L"ST_TX/Y \"a\"\n"), 0x80004005U},
+        {raised(L""), 0x80070057U},
+        {VariantClear(&unknown), 0x80020008U},
+        {E_OUTOFMEMORY, 0x8007000EU}};
+    for (const auto& [result, number] : cases) {
+        EXPECT_EQ(static_cast<std::uint32_t>(result), number);
+        EXPECT_TRUE(FAILED(result) != SUCCEEDED(result) && FAILED(result) == (number != 0));
+    }
+}
+
 TEST(CodePages, ConvertAsTheirCasesSay)
 {
     const auto rows = Rows(DCM_TEST_DATA "/codepages.txt");
@@ -165,6 +190,19 @@ TEST(File, SaysWhyItCannotBeOpened)
     EXPECT_TRUE(std::string(error.what()).starts_with(dcm::ToUtf8(missing)));
 }
 
+TEST(File, SaysInWordsWhatWentWrong)
+{
+    const std::pair<CFileException::Cause, std::string> cases[] = {
+        {CFileException::invalidFile, "not an open file"},
+        {CFileException::accessDenied, "not a file that can be read or written as a whole"},
+        {CFileException::fileTooLarge, "2 GiB or larger"},
+        {CFileException::diskFull, "no room for all of the text"},
+        {CFileException::sharingViolation, "another program or document has the file open"},
+        {CFileException::generic, "file error"}};
+    for (const auto& [cause, words] : cases)
+        EXPECT_EQ(CFileException(cause, 0, L"\u00E4").what(), "\xC3\xA4: " + words);
+}
+
 TEST(File, ReadsAndWritesWhatItsFlagsSay)
 {
     const Folder folder;
@@ -178,12 +216,14 @@ TEST(File, ReadsAndWritesWhatItsFlagsSay)
     EXPECT_EQ(file.Read(bytes, 3) + file.Read(bytes + 3, 5), 6U);
     EXPECT_STREQ(bytes, "XYcdef");
     file.Write("g", 1);
+    CFileStatus status;
+    EXPECT_TRUE(file.GetStatus(status));
+    EXPECT_EQ(status.m_size, 7U);
     EXPECT_EQ(file.GetLength(), 7U);
     EXPECT_TRUE(file.Open(path, kCreate));
     EXPECT_EQ(file.GetLength(), 0U);
     EXPECT_THROW(file.Read(bytes, 1), CFileException) << "a file that is only written";
     file.Close();
-    CFileStatus status;
     EXPECT_FALSE(file.GetStatus(status));
     EXPECT_THROW(file.GetLength(), CFileException);
     EXPECT_THROW(file.Write(bytes, 1), CFileException);
@@ -203,6 +243,7 @@ TEST(Modules, StandInTheListWhileTheyAreLoaded)
     auto* const first = new CDynLinkLibrary(one);
     auto* const second = new CDynLinkLibrary(two);
     EXPECT_EQ(CDynLinkLibrary::Last(), second);
+    EXPECT_EQ(&second->Module(), &two);
     EXPECT_EQ(second->Previous(), first);
     AfxTermExtensionModule(one);
     EXPECT_EQ(second->Previous(), before);

@@ -59,6 +59,18 @@ TEST(TextFile, OpensAnewWithOrWithoutSuccess)
         EXPECT_EQ(file.ReadLine(line), 1);
         EXPECT_EQ(line, L"a1");
     }
+    // A class of the host may load the text once more, from where the file was read to.
+    struct HostFile : PravFile
+    {
+        using PravFile::LoadContent, PravFile::PravFile;
+    };
+    for (const UINT flags : {kRead, kCreate}) {
+        file.Close();
+        HostFile again(folder / L"a", kRead);
+        EXPECT_EQ(again.ReadLine(line), 1);
+        again.LoadContent(flags);
+        EXPECT_EQ(Lines(again), "");
+    }
     EXPECT_FALSE(static_cast<CFile&>(file).Open(folder / L"missing", kRead));
     EXPECT_EQ(Lines(file), "");
     EXPECT_THROW(file.WriteText(L"a"), CFileException);
