@@ -16,7 +16,8 @@
 namespace dcm {
 
 /// How parameters are compared. As it is made, numbers are the same only bit by bit: 0.0 and -0.0
-/// differ, a not-a-number is the same as one with the same bits.
+/// differ, a not-a-number is the same as one with the same bits. Tolerances hold for values and
+/// axis points; an infinity or not-a-number is never within one.
 struct Comparison
 {
     /// Numbers are the same when |new - old| is at most this. 0 for none.
@@ -44,8 +45,9 @@ enum class Field
     kUnitY,
     kDistributionX,
     kDistributionY,
-    /// Counts that differ though the numbers of points do not account for it: those of a
-    /// FESTWERTEBLOCK in rows, or counts that disagree with the points.
+    /// Counts as the first line of the block has them, where they differ and the numbers of
+    /// points (for curves, of values) do not account for it: those of a FESTWERTEBLOCK in rows, or
+    /// counts that disagree with the points.
     kCountX,
     kCountY,
 };
@@ -92,16 +94,17 @@ enum class Change
 /// One parameter that is not the same in both lists.
 struct Difference
 {
-    Change change;
-    Kind kind;
+    Change change = Change::kChanged;
+    Kind kind = Kind::kFestwert;
     CString name;
     /// Where the parameter is in the two lists; `kNoIndex` where it is not.
-    std::size_t oldIndex;
-    std::size_t newIndex;
+    std::size_t oldIndex = kNoIndex;
+    std::size_t newIndex = kNoIndex;
     /// For a changed parameter: all that differs, in the order of the fields, points and values.
     std::vector<FieldDifference> fields;
-    /// Points of the axes. An axis with points added or removed lists these alone; otherwise its
-    /// points are compared one by one.
+    /// Points of the axes. Where points were added or removed these alone are listed, the removed
+    /// ones first. Points that have changed in their places, or their order, are compared one by
+    /// one.
     std::vector<ValueDifference> x;
     std::vector<ValueDifference> y;
     std::vector<ValueDifference> values;
@@ -110,9 +113,11 @@ struct Difference
 /// Compares two lists of parameters, paired by kind and name; names that are there several times
 /// are paired in their order. The result is in the order of the kinds, within a kind in the order
 /// of the old list, with added parameters last in the order of the new one. Values over an axis
-/// that has changed are compared at equal points; values at points that only one side has are
-/// listed as values that the other lacks. Takes time in proportion to the content of both lists.
-/// Throws only when memory runs out.
+/// that has changed are compared at equal points (a point that is there several times in the order
+/// of its places); values at points that only one side has are listed as values that the other
+/// lacks. A FESTWERTEBLOCK in rows is compared row by row when the length of its rows has changed.
+/// Values are listed in the old order, those that the old side lacks last. Takes time in proportion
+/// to the content of both lists. Throws only when memory runs out.
 DCM_API std::vector<Difference> Differences(std::span<const Parameter> oldParameters,
                                             std::span<const Parameter> newParameters,
                                             const Comparison& comparison = {});

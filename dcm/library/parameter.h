@@ -47,7 +47,7 @@ inline constexpr std::array kKinds = {
     Kind::kTextstring,
 };
 
-/// The keyword of a kind, such as L"KENNFELD".
+/// The keyword of a kind, such as L"KENNFELD"; empty for a number that is no kind.
 DCM_API std::wstring_view KeywordOf(Kind kind) noexcept;
 /// The kind of a keyword, in letters of any case; none for any other word.
 DCM_API std::optional<Kind> KindOf(std::wstring_view keyword) noexcept;
@@ -59,8 +59,9 @@ struct Axis
     CString unit;
     /// Name of the STUETZSTELLENVERTEILUNG that the axis shares; empty for none.
     CString distribution;
-    /// The points in their order: numbers (`VT_R8`) or texts (`VT_BSTR`). Entries of other tags
-    /// are kept but never written, see `DCMKennlinie`.
+    /// The points in their order, each a number (`VT_R8`), a text (`VT_BSTR`) or nothing
+    /// (`VT_EMPTY`). Nothing is what the block counts but never writes, see `DCMKennlinie`: a point
+    /// that is of another type than those before it, or that a host stored under another tag.
     std::vector<CComVariant> points;
 };
 
@@ -80,9 +81,9 @@ struct Parameter
     CString unit;
     /// The values row after row, one row for each point of y: the value at point i of x and point
     /// j of y has the index j * columns + i. A FESTWERT or TEXTSTRING has one, or none when the
-    /// block has no value; a distribution has none. Numbers are `VT_R8` and texts `VT_BSTR`; what
-    /// a host stored under other tags comes back under these. A FESTWERTEBLOCK that holds both
-    /// gives its numbers first, then its texts.
+    /// block has no value; a distribution has none. A FESTWERTEBLOCK that holds numbers and texts
+    /// gives its numbers first, then its texts. Values are numbers, texts or nothing as points are;
+    /// a number that a FESTWERT holds under any other tag is `VT_R8` here.
     std::vector<CComVariant> values;
     /// Values in a row. For a map the number of points of x, for a FESTWERTEBLOCK in rows its X
     /// count, otherwise the number of values. The values need not fill their last row. `Add` does
@@ -113,21 +114,26 @@ DCM_API std::vector<Parameter> ParametersOf(const DCMConverter& document);
 DCM_API std::vector<Parameter> ParametersOf(DCMConverter&& document);
 
 /// Appends the parameter to the document as a block of its kind. Distribution names are set for
-/// export, so that they are written. A FESTWERT or TEXTSTRING takes the first value, whatever its
-/// tag. A FESTWERTEBLOCK takes texts as texts and any other value as the number that it stands
-/// for, 0.0 when it stands for none. Nothing is checked: names may repeat and values need not fill
-/// their rows. When memory runs out, the failure is raised and the document is as it was.
+/// export, so that they are written. A number under any tag, such as the `VT_I4` of an int, becomes
+/// a `VT_R8`; what is neither number nor text becomes a value or point without content, and 0.0 in
+/// a FESTWERTEBLOCK. A FESTWERT or TEXTSTRING takes the first value. A curve or map holds numbers
+/// or texts in each array: from the first of the other type on, its points are not written.
+/// Nothing is checked: names may repeat and values need not fill their rows. When memory runs out,
+/// the failure is raised and the document is as it was.
 DCM_API void Add(DCMConverter& document, const Parameter& parameter);
 /// The same by moving points and values; the parameter has no defined content afterwards.
 DCM_API void Add(DCMConverter& document, Parameter&& parameter);
 
-/// The header text for a comment: each of its lines after "* ", so that an import of the exported
-/// file finds the same comment. `out.SetHeader(dcm::HeaderOfComment(in.GetComment()))` carries the
-/// comment of a file over. An empty comment gives an empty text.
+/// The header text for a comment: its lines with "* " before each, so that an import of the
+/// exported file finds the same comment. `out.SetHeader(dcm::HeaderOfComment(in.GetComment()))`
+/// carries the comment of a file over. A later line that is a row of asterisks stays as it is, and
+/// a "* " within a line is written as "**  ". An empty comment gives an empty text. Throws only
+/// when memory runs out.
 DCM_API CString HeaderOfComment(const CString& comment);
 
 /// What `ForEach` calls for each block. The blocks are those of the document, valid during the
-/// call alone. A member that is not overridden does nothing.
+/// call alone. A member that is not overridden does nothing; a class that overrides some of them
+/// says `using BlockVisitor::Visit;` to keep the others visible.
 class DCM_API BlockVisitor
 {
 public:
