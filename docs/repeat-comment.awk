@@ -1,5 +1,5 @@
-# A doc comment in the headers holds for all declarations below it, up to an empty line or the next
-# comment. Doxygen wants one for each: this filter repeats it in front of those that follow.
+# A doc comment in the headers describes all declarations below it, up to an empty line or the next
+# comment. Doxygen needs one for each: this filter repeats it before the second and later ones.
 function indent() { match($0, /^ */); return RLENGTH }
 
 /^ *\/\/\// {
@@ -13,7 +13,7 @@ function indent() { match($0, /^ */); return RLENGTH }
 }
 /^ *$/ || /^ *(public|protected|private):/ { comment = "" }
 {
-    # The first declaration has the comment itself; the end of one tells that another begins.
+    # The first declaration has the comment itself; the end of one means that another begins.
     if (comment != "" && !in_comment && !/~/ && ended && indent() == level && $0 !~ /^ *[{}]/)
         printf "%s", comment
     in_comment = 0
