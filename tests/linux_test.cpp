@@ -68,6 +68,12 @@ DCM_TEST_WRAP(int, ftruncate, 0, (int file, off_t length), (file, length))
 DCM_TEST_WRAP(ssize_t, read, count, (int file, void* to, std::size_t count),
               (file, to, static_cast<std::size_t>(room)))
 
+DCM_TEST_WRAP(int, fsync, 0, (int file), (file))
+DCM_TEST_WRAP(int, fchmod, 0, (int file, mode_t mode), (file, mode))
+DCM_TEST_WRAP(ssize_t, readlink, 0, (const char* path, char* to, std::size_t size),
+              (path, to, size))
+DCM_TEST_WRAP(int, rename, 0, (const char* from, const char* to), (from, to))
+
 ssize_t __real_write(int file, const void* from, std::size_t count);
 ssize_t __wrap_write(int file, const void* from, std::size_t count)
 {
@@ -353,4 +359,68 @@ TEST(LinuxFile, ReportsAFullDevice)
     EXPECT_EQ(DCMConverter().Export(L"/dev/full"), E_UNEXPECTED);
     EXPECT_EQ(DCMConverter().Export(L"/dev/null"), S_OK);
     EXPECT_EQ(DCMConverter().Import(L"/dev/null"), S_OK);
+}
+
+TEST(Save, LeavesTheOldFileWhenACallFails)
+{
+    const Folder folder;
+    const CString path = folder / L"out.dcm";
+    const std::filesystem::path place = PathOf(path).parent_path();
+    DCMConverter document;
+    ASSERT_EQ(document.Import(DCM_ALL_KINDS), S_OK);
+    const auto files = [&] {
+        return std::distance(std::filesystem::directory_iterator(place), {});
+    };
+    for (const char* const call : {"readlink", "open", "fstat", "fchmod", "ftruncate", "write",
+                                   "fsync", "close", "rename"}) {
+        bool met = true;
+        for (int number = 1; met; ++number) {
+            SCOPED_TRACE(call + std::to_string(number));
+            WriteBytes(path, "old");
+            dcm::Report report;
+            HRESULT result = S_OK;
+            met = Under({call, number, EIO}, [&] { result = dcm::Save(document, path, report); });
+            EXPECT_EQ(files(), 1);
+            const std::string now = ReadBytes(path);
+            if (result == S_OK) {
+                EXPECT_EQ(now, ExportBytes(document));
+                EXPECT_EQ(report.Count(), 0U);
+            } else {
+                EXPECT_TRUE(met);
+                EXPECT_EQ(now, "old");
+                EXPECT_EQ(report.Count("cannot-open") + report.Count("cannot-write"), 1U);
+                const std::wstring_view words = report.Findings().at(0).message;
+                EXPECT_NE(words.find(L"): " + std::wstring(path.View()) + L":"), words.npos);
+            }
+        }
+    }
+}
+
+TEST(Save, KeepsLinksAndModes)
+{
+    const Folder folder;
+    const DCMConverter document;
+    const std::string content = ExportBytes(document);
+    dcm::Report report;
+    const CString file = folder / L"file", first = folder / L"first", second = folder / L"second";
+    namespace fs = std::filesystem;
+    fs::create_symlink(PathOf(second), PathOf(first));
+    fs::create_symlink("file", PathOf(second));
+    // The second time the file is there.
+    for (const auto mode : {fs::perms{0}, fs::perms(0640)}) {
+        if (mode != fs::perms{0})
+            fs::permissions(PathOf(file), mode);
+        EXPECT_EQ(dcm::Save(document, first, report), S_OK);
+        EXPECT_TRUE(fs::is_symlink(PathOf(first)) && fs::is_symlink(PathOf(second)));
+        EXPECT_EQ(ReadBytes(file), content);
+    }
+    EXPECT_EQ(fs::status(PathOf(file)).permissions(), fs::perms(0640));
+    // A name of bytes that are no UTF-8, and links in a circle.
+    fs::remove(PathOf(second));
+    fs::create_symlink("\xff", PathOf(second));
+    EXPECT_EQ(dcm::Save(document, second, report), E_UNEXPECTED);
+    fs::remove(PathOf(second));
+    fs::create_symlink("second", PathOf(second));
+    EXPECT_EQ(dcm::Save(document, first, report), E_UNEXPECTED);
+    EXPECT_NE(report.Findings().at(0).message.View().find(L"(badPath)"), std::wstring_view::npos);
 }

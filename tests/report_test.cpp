@@ -54,6 +54,31 @@ TEST(Report, SaysWhyAFileCannotBeUsed)
     }
 }
 
+TEST(Save, ReplacesAFileThatNobodyHasOpen)
+{
+    const Folder folder;
+    const CString path = folder / L"out.dcm";
+    const DCMConverter document;
+    const std::string content = ExportBytes(document);
+    dcm::Report report;
+    EXPECT_EQ(dcm::Save(document, path, report), S_OK);
+    EXPECT_EQ(ReadBytes(path), content);
+    WriteBytes(path, "old");
+    {
+        const CFile open(path, kRead);
+        EXPECT_EQ(dcm::Save(document, path, report), E_UNEXPECTED);
+        EXPECT_EQ(report.Count("cannot-open"), 1U);
+    }
+    EXPECT_EQ(ReadBytes(path), "old");
+    EXPECT_EQ(dcm::Save(document, path, report), S_OK);
+    EXPECT_EQ(ReadBytes(path), content);
+    EXPECT_EQ(dcm::Save(document, dcm::NullDevice(), report), S_OK);
+    EXPECT_EQ(dcm::Save(document, folder / L"", report), E_UNEXPECTED);
+    EXPECT_EQ(dcm::Save(document, folder / L"none/out.dcm", report), E_UNEXPECTED);
+    const auto all = std::filesystem::directory_iterator(PathOf(path).parent_path());
+    EXPECT_EQ(std::distance(all, {}), 1);
+}
+
 TEST(Report, IsEmptiedByTheNextCall)
 {
     const Folder folder;

@@ -267,7 +267,7 @@ HRESULT DCMConverter::Export(const CString& strPath) const
     }
 }
 
-void dcm::DocumentIo::Export(const DCMConverter& document, const CString& path, FileStage& stage,
+bool dcm::DocumentIo::Export(const DCMConverter& document, const CString& path, FileStage& stage,
                              FindingList*)
 {
     stage = FileStage::kOpening;
@@ -275,13 +275,14 @@ void dcm::DocumentIo::Export(const DCMConverter& document, const CString& path, 
     stage = FileStage::kBlocks;
     CFileStatus status;
     if (!file.GetStatus(status))
-        return;
+        return false;
     // Every writer returns 0: what fails is thrown.
     document.WriteHeader(file);
     document.WriteFormat(file);
     for (const DCMConverter::BlockKind& kind : DCMConverter::kBlockKinds)
         (document.*kind.write)(file);
     file.Close();
+    return true;
 }
 
 HRESULT DCMConverter::WriteHeader(PravFile& file) const

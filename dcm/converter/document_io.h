@@ -19,11 +19,13 @@ enum class FileStage : unsigned char
 
 struct DocumentIo
 {
-    /// What the document's Import and Export do; failures are raised. `stage` tells how far it
-    /// came. Nothing is reported when `findings` is null.
+    /// What the document's Import does; failures are raised. `stage` tells how far it came.
+    /// Nothing is reported when `findings` is null.
     static void Import(DCMConverter& document, const CString& path, FileStage& stage,
                        FindingList* findings);
-    static void Export(const DCMConverter& document, const CString& path, FileStage& stage,
+    /// The same for Export. Returns false when the system does not answer for the open file:
+    /// nothing is written then.
+    static bool Export(const DCMConverter& document, const CString& path, FileStage& stage,
                        FindingList* findings);
 };
 

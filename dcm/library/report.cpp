@@ -4,6 +4,7 @@
 #include "dcm/platform/cfile.h"
 #include "dcm/platform/codepage.h"
 #include "dcm/platform/null_device.h"
+#include "dcm/platform/replacement_file.h"
 #include "dcm/textfile/findings.h"
 
 #include <algorithm>
@@ -101,6 +102,12 @@ void AddFileFailure(FindingList& findings, FileStage stage, Direction direction,
         add(FindingKind::kCannotRead, L"The file cannot be read");
     else
         add(FindingKind::kCannotWrite, L"The file cannot be written");
+}
+
+/// The failure of an open file for which the system does not answer.
+CFileException NoAnswer(const CString& path)
+{
+    return {CFileException::generic, 0, path};
 }
 
 /// Runs an import or export and reports the failure that ends it.
@@ -239,7 +246,26 @@ HRESULT Export(const DCMConverter& document, const CString& path, Report& report
     ReportAccess::Empty(report);
     FindingList findings(report.Limit());
     const HRESULT result = Run(findings, Direction::kExport, [&](FileStage& stage) {
-        DocumentIo::Export(document, path, stage, &findings);
+        if (!DocumentIo::Export(document, path, stage, &findings))
+            AddFileFailure(findings, stage, Direction::kExport, NoAnswer(path));
+    });
+    ReportAccess::Set(report, std::move(findings));
+    return result;
+}
+
+HRESULT Save(const DCMConverter& document, const CString& path, Report& report)
+{
+    ReportAccess::Empty(report);
+    FindingList findings(report.Limit());
+    const HRESULT result = Run(findings, Direction::kExport, [&](FileStage& stage) {
+        ReplacementFile file(path);
+        try {
+            if (!DocumentIo::Export(document, file.Path(), stage, &findings))
+                throw NoAnswer(path);
+        } catch (const CFileException& error) {
+            throw CFileException(error.m_cause, error.m_lOsError, path);
+        }
+        file.TakePlace();
     });
     ReportAccess::Set(report, std::move(findings));
     return result;

@@ -1,6 +1,7 @@
 #include "dcm/platform/system_file.h"
 
 #include "dcm/platform/codepage.h"
+#include "dcm/platform/linux/lock.h"
 
 #include <cerrno>
 #include <fcntl.h>
@@ -38,17 +39,6 @@ public:
 private:
     int m_file;
 };
-
-/// Locks the whole file without waiting. Returns false when somebody else has locked it. Where the
-/// file system has no such locks, the file is used without one.
-bool Lock(int file)
-{
-    while (flock(file, LOCK_EX | LOCK_NB) != 0) {
-        if (errno != EINTR)
-            return errno != EWOULDBLOCK;
-    }
-    return true;
-}
 
 } // namespace
 
