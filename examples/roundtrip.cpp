@@ -1,5 +1,5 @@
 // roundtrip IN.dcm [OUT.dcm]
-// Shows what a DCM file holds, in UTF-8, and writes it again.
+// Prints what is in a DCM file, in UTF-8, and writes it again.
 #include "dcm/library/dcm.h"
 
 #include <algorithm>
@@ -51,7 +51,7 @@ std::string TextOf(const VARIANT& value)
     return {digits, std::to_chars(digits, std::end(digits), value.dblVal).ptr};
 }
 
-/// The first values, and how many there are when these are not all.
+/// The first values, and the count of all values if there are more.
 std::string Summary(const Values& values)
 {
     constexpr std::size_t kMostShown = 6;
@@ -63,7 +63,7 @@ std::string Summary(const Values& values)
     return summary;
 }
 
-/// `text` in UTF-8, filled up with blanks to `width` characters.
+/// `text` in UTF-8, padded with blanks to `width` characters.
 std::string Column(const CString& text, int width)
 {
     const int missing = std::max(width - text.GetLength(), 0);
