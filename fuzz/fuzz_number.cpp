@@ -1,5 +1,5 @@
-// Numbers are written as the standard library does it and read as the C library does it in the C
-// locale, but for the forms that the format has for itself.
+// Numbers are written as the standard library writes them and read as the C library reads them in
+// the C locale, except for the forms that only this format has.
 
 #include "fuzz/target.h"
 #include "tests/number_check.h"
@@ -25,12 +25,12 @@ double ReferenceNumber(std::string token)
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
     const std::string text(reinterpret_cast<const char*>(data), size);
-    // Behind the text there may be room for more to be read at once.
+    // More text after it may be read at once.
     for (const char* tail : {"", "   \t 7.25       "}) {
         const std::string wrong = WrongLine(text + tail, ReferenceNumber);
         Require(wrong.empty(), wrong.c_str());
     }
-    // The C library saturates at 64 bits, far beyond the limits of 32.
+    // The C library saturates at the limits of 64 bits.
     const long long integer = std::strtoll(text.c_str(), nullptr, 10);
     const auto expected = std::clamp<long long>(integer, std::numeric_limits<std::int32_t>::min(),
                                                 std::numeric_limits<std::int32_t>::max());

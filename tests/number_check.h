@@ -1,15 +1,18 @@
 #pragma once
 
 #include "dcm/elements/number.h"
-#include "dcm/platform/codepage.h"
+#include "dcm/platform/word.h"
 
 #include <algorithm>
 #include <array>
 #include <bit>
+#include <cfloat>
 #include <charconv>
+#include <clocale>
 #include <cmath>
 #include <cstddef>
 #include <cstdint>
+#include <cstdlib>
 #include <iomanip>
 #include <limits>
 #include <locale>
@@ -19,8 +22,8 @@
 #include <string_view>
 #include <system_error>
 
-/// Numbers and number texts of every kind from a seed: of few and many digits, of any size, round
-/// ones, and those that are hard to round.
+/// Numbers and number texts of every kind from a seed: of few and of many digits, of any size,
+/// round ones, and those that are hard to round.
 class NumberSource
 {
 public:
@@ -42,7 +45,7 @@ public:
     {
         if (Below(4) != 0)
             return DecimalText();
-        // Half-way between two numbers, or a little above.
+        // Halfway between two numbers, or a little above.
         const double number = Number();
         const double next = std::nextafter(number, std::numeric_limits<double>::max());
         std::ostringstream text;
@@ -58,17 +61,25 @@ public:
     static double Parse(const std::string& text)
     {
         double value = 0;
-        if (std::from_chars(text.data(), text.data() + text.size(), value).ec == std::errc())
+        if (ParseAtOnce(text.data(), text.data() + text.size(), value))
             return value;
-        std::istringstream stream(text);
-        stream.imbue(std::locale::classic());
-        if (!(stream >> value)) // Too large: the largest number, with its sign.
-            value *= std::numeric_limits<double>::infinity();
-        return value;
+        std::string local = text;
+        if (const auto point = local.find('.'); point != local.npos)
+            local.replace(point, 1, std::localeconv()->decimal_point);
+        return std::strtod(local.c_str(), nullptr);
     }
 
 private:
-    std::size_t Below(std::size_t limit) { return m_random() % limit; }
+    /// Uses `from_chars`; false for numbers out of range, where the standard library has none for
+    /// doubles, and where registers are wider than a double, because libstdc++ rounds twice there.
+    template <class Value>
+    static bool ParseAtOnce(const char* begin, const char* end, Value& value)
+    {
+        if constexpr (FLT_EVAL_METHOD == 0 && requires { std::from_chars(begin, end, value); })
+            return std::from_chars(begin, end, value).ec == std::errc();
+        return false;
+    }
+    std::size_t Below(std::size_t limit) { return static_cast<std::size_t>(m_random() % limit); }
     std::string DecimalText()
     {
         const std::string_view digits = Below(2) == 0 ? "0123456789" : "0009999995";
@@ -83,7 +94,7 @@ private:
     std::mt19937_64 m_random;
 };
 
-/// What is written for a number, with the blank in front.
+/// What is written for a number, with the blank before it.
 inline std::string Text(double number, int digits)
 {
     std::string text(dcm::kNumberTextMax + 1, 'x');
@@ -98,7 +109,7 @@ inline std::string Text(double number, int digits)
 template <class Expected>
 std::string WrongLine(const std::string& line, Expected expected)
 {
-    const std::string text = line + "\"5.5e5.5"; // What is behind the line must not count.
+    const std::string text = line + "\"5.5e5.5"; // What follows the line must not count.
     static_assert(dcm::kReadAhead == 8);
     dcm::NumberReader numbers({text.data(), line.size()});
     std::array<double, dcm::kNumbersAtOnce> values;
@@ -131,8 +142,8 @@ inline std::string WrongNumber(const std::string& token, double expected)
     return wrong;
 }
 
-/// What is wrong with the text of a finite number by the standard library's measure; empty if
-/// nothing is.
+/// How the text of a finite number differs from what the standard library writes; empty if it does
+/// not.
 inline std::string WrongText(double number)
 {
     for (const int digits : {dcm::kFullDigits, dcm::kShortDigits}) {

@@ -9,58 +9,62 @@
 namespace dcm {
 namespace {
 
-/// The significand of a power of ten: words from high to low, the highest bit set. Each step rounds
-/// down, by less than one unit of the last word, so that after 342 steps the exact significand is
+/// The significand of a power of ten: words from low to high, the highest bit set. Each step rounds
+/// down, by less than one unit of the lowest word, so that after 342 steps the exact significand is
 /// less than 2 x 342 units above.
 class Significand
 {
 public:
-    /// Ten times as much, as 5/4 or 5/8.
+    /// Multiplies by ten, as 5/4 or 5/8.
     constexpr void TimesTen()
     {
-        uint128 product = 0;
-        for (std::size_t i = 3; i-- > 0;) {
-            product = (product >> 64) + uint128{m_word[i]} * 5;
-            m_word[i] = static_cast<std::uint64_t>(product);
+        std::uint64_t carry = 0;
+        for (auto& word : m_words) {
+            carry += std::uint64_t{word} * 5;
+            word = static_cast<std::uint32_t>(carry);
+            carry >>= kWordBits;
         }
-        Normalise(static_cast<std::uint64_t>(product >> 64));
+        ShiftIn(carry);
     }
 
-    /// A tenth, as 4/5 or 8/5: the quotient by 5 with 64 bits more, cut again.
+    /// Divides by ten, as 4/5 or 8/5: the quotient by 5, from one word below the lowest.
     constexpr void OverTen()
     {
-        const auto word = m_word;
-        uint128 rest = word[0];
-        const auto top = static_cast<std::uint64_t>(rest / 5);
-        for (std::size_t i = 0; i < 3; ++i) {
-            rest = ((rest % 5) << 64) | (i < 2 ? word[i + 1] : 0);
-            m_word[i] = static_cast<std::uint64_t>(rest / 5);
+        const auto top = m_words.back() / 5;
+        std::uint64_t rest = m_words.back() % 5;
+        for (std::size_t i = m_words.size(); i-- > 0;) {
+            rest = rest << kWordBits | (i > 0 ? m_words[i - 1] : 0);
+            m_words[i] = static_cast<std::uint32_t>(rest / 5);
+            rest %= 5;
         }
-        Normalise(top);
+        ShiftIn(top);
     }
 
     constexpr Power Upper() const
     {
-        if (m_word[2] > std::numeric_limits<std::uint64_t>::max() - std::uint64_t{2} * 342) {
+        if (m_words[1] == std::numeric_limits<std::uint32_t>::max())
             throw "a carry into the upper words could be lost"; // Stops the compiler.
-        }
-        return {m_word[0], m_word[1]};
+        return {Pair(4), Pair(2)};
     }
 
 private:
-    /// Shifts `top`, which is not 0, into the words from above, down to its highest bit.
-    constexpr void Normalise(std::uint64_t top)
+    constexpr std::uint64_t Pair(std::size_t i) const
     {
-        const int bits = 64 - std::countl_zero(top);
-        for (auto& word : m_word) {
-            const auto lower = word;
-            // NOLINTNEXTLINE(clang-analyzer-core.UndefinedBinaryOperatorResult): `bits` is not 0.
-            word = (top << (64 - bits)) | (lower >> bits);
-            top = lower;
+        return std::uint64_t{m_words[i + 1]} << kWordBits | m_words[i];
+    }
+
+    /// Shifts `top`, which is not 0, into the words from above, down to its highest bit.
+    constexpr void ShiftIn(std::uint64_t top)
+    {
+        const auto bits = static_cast<int>(std::bit_width(top));
+        for (std::size_t i = 0; i < m_words.size(); ++i) {
+            const auto above = i + 1 < m_words.size() ? m_words[i + 1] : top;
+            m_words[i] = static_cast<std::uint32_t>((above << kWordBits | m_words[i]) >> bits);
         }
     }
 
-    std::array<std::uint64_t, 3> m_word{std::uint64_t{1} << 63, 0, 0};
+    static constexpr int kWordBits = 32;
+    std::array<std::uint32_t, 6> m_words{0, 0, 0, 0, 0, 0x8000'0000};
 };
 
 constexpr auto MakePowers()

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "dcm/platform/wide_product.h"
 #include "dcm/platform/word.h"
 
 #include <array>
@@ -16,16 +17,12 @@
 //
 //     H x 2^64  <=  w x (T + d)  <  w x T + 2^64  <  (H + 2) x 2^64,
 //
-// so the exact product lies in [H, H + 2) in units of 2^64. To round it at a higher bit is to ask
-// on which side of a point B half-way between two results it lies: above when H > B, below when
-// H + 2 <= B. Only H = B and H = B - 1 leave it open, and those few numbers go another, exact way.
-// (Where the interval reaches past a result, as it does just short of an exact one, both its ends
-// round to that result.) The same holds with 64 in place of 128 bits of T and H.
+// so the exact product lies in [H, H + 2) in units of 2^64. Rounding it at a higher bit needs to
+// know on which side of a point B, halfway between two results, it lies: above when H > B, below
+// when H + 2 <= B. H = B and H = B - 1 do not tell; those few numbers are converted in another,
+// exact way. (Just below an exact result the interval may contain that result. Both its ends round
+// to it.) The same holds with 64 instead of 128 bits of T and H.
 namespace dcm {
-
-/// Like std::uint64_t, twice as wide.
-// NOLINTNEXTLINE(modernize-use-using): only a typedef can carry the mark of an extension.
-__extension__ typedef unsigned __int128 uint128;
 
 constexpr std::uint64_t kTenTo8 = 100'000'000;
 constexpr std::uint64_t kTenTo16 = kTenTo8 * kTenTo8;
@@ -43,7 +40,7 @@ struct Decimal
     int exponent = 0;
 };
 
-/// A power of ten's upper 128 bits: T above.
+/// The upper 128 bits of a power of ten: T as explained above.
 struct Power
 {
     std::uint64_t high;
@@ -76,7 +73,7 @@ constexpr int Exponent10(int power)
 /// to even: `digits` has just that many. By the standard library.
 Decimal ToDecimalExactly(double value, int count) noexcept;
 
-/// ToDecimalExactly, for almost all numbers by one product.
+/// The same, for almost all numbers by one product.
 inline Decimal ToDecimal(double value, int count) noexcept
 {
     const auto bits = std::bit_cast<std::uint64_t>(value);
@@ -88,23 +85,23 @@ inline Decimal ToDecimal(double value, int count) noexcept
     const auto w = bits << (63 - kFractionBits) | kSignBit;
     const int exponent = biased - kExponentBias - 63;
 
-    // The first digit's power of ten: that of the power of two, or one more when the next power of
-    // ten lies between that and the value.
+    // The power of ten of the first digit: that of the power of two, or one more if the next power
+    // of ten is between the power of two and the value.
     int first = Exponent10(exponent + 63);
     const auto& next = kPowers[PowerIndex(first + 1)];
     first += static_cast<int>(Exponent2(first + 1) == exponent + 63) &
              static_cast<int>(w >= next.high + (next.low != 0 ? 1 : 0));
 
-    // The upper word of H has `places` bits behind the point.
+    // The upper word of H has `places` bits after the point.
     const int last = first - count + 1;
     const auto& power = kPowers[PowerIndex(-last)];
-    const auto h = uint128{w} * power.high + ((uint128{w} * power.low) >> 64);
-    const auto high = static_cast<std::uint64_t>(h >> 64);
-    const auto low = static_cast<std::uint64_t>(h);
+    const auto upper = Multiply(w, power.high);
+    const auto low = upper.low + Multiply(w, power.low).high;
+    const auto high = upper.high + (low < upper.low ? 1 : 0);
     const int places = -1 - exponent - Exponent2(-last);
     const auto half = std::uint64_t{1} << (places - 1);
-    const auto behind = high & (2 * half - 1);
-    if (behind + 1 - half <= 1 && low + 1 <= 1) {
+    const auto fraction = high & (2 * half - 1);
+    if (fraction + 1 - half <= 1 && low + 1 <= 1) {
         return ToDecimalExactly(value, count);
     }
     const auto digits = (high + half) >> places;
@@ -112,8 +109,9 @@ inline Decimal ToDecimal(double value, int count) noexcept
     return digits == limit ? Decimal{limit / 10, last + 1} : Decimal{digits, last};
 }
 
-/// Stores the double nearest to `decimal` and returns true; false when this way cannot tell, as for
-/// one number of many digits in five hundred, or when the result is not a normal number.
+/// Stores the double nearest to `decimal` and returns true; false when one product of 64 bits does
+/// not tell, as for one number of many digits in five hundred, or when the result is neither 0 nor
+/// a normal number.
 inline bool ToDouble(Decimal decimal, double& value) noexcept
 {
     if (decimal.digits == 0) {
@@ -125,8 +123,7 @@ inline bool ToDouble(Decimal decimal, double& value) noexcept
         return false;
     }
     const int zeros = std::countl_zero(decimal.digits);
-    const auto product = uint128{decimal.digits << zeros} * kPowers[index].high;
-    const auto h = static_cast<std::uint64_t>(product >> 64);
+    const auto h = Multiply(decimal.digits << zeros, kPowers[index].high).high;
     // H becomes a significand of 53 bits and 10 more. Where it loses a bit by that, the exact
     // product still lies in [H, H + 2).
     constexpr int places = 10;
@@ -144,7 +141,7 @@ inline bool ToDouble(Decimal decimal, double& value) noexcept
     return true;
 }
 
-/// LoadWord, with 0 to 9 for digits.
+/// The eight characters at `at`, with 0 to 9 for digits.
 inline std::uint64_t DigitBytes(const char* at)
 {
     return LoadWord(at) ^ RepeatByte('0');
@@ -153,20 +150,20 @@ inline std::uint64_t DigitBytes(const char* at)
 /// What NotDigits marks a byte with.
 constexpr std::uint64_t kNotDigit = 0x80;
 
-/// The highest bit of each byte that is not a digit, nothing of those that are: only 10 and more
-/// reach it with the added 118. Behind a byte from 0x8A on, out of which the sum carries, digits
-/// may be marked too.
+/// The highest bit of each byte that is not a digit, 0 for each that is: adding 118 sets it for 10
+/// and more. After a byte from 0x8A on, whose sum carries into the next, a digit may be marked too.
 constexpr std::uint64_t NotDigits(std::uint64_t bytes)
 {
     return (bytes | (bytes + RepeatByte(kNotDigit - 10))) & RepeatByte(kNotDigit);
 }
 
-/// The highest bit of each byte that is not a point, and any other bits. A slash behind a point is
-/// taken for another one.
+/// The highest bit of each byte that is not a point; the other bits mean nothing. A slash after a
+/// point counts as another point.
 constexpr std::uint64_t NotPoints(std::uint64_t bytes)
 {
-    // The sum is the byte's negative, with the highest bit for 1 to 128. It carries out of a point
-    // only, which makes a negative of 0 for the slash: that is 1 here.
+    // The sum is the negative of the byte, which has the highest bit set for 1 to 128. Only a
+    // point, which is 0, carries into the next byte; the negative of a slash, which is 1, becomes 0
+    // by that.
     const auto others = bytes ^ RepeatByte('.' ^ '0');
     return others | (~others + RepeatByte(1));
 }
@@ -180,7 +177,7 @@ constexpr bool AreDigits(std::uint64_t bytes)
 /// The number whose digits are the bytes 0 to 9 of a word, the first in the lowest byte.
 constexpr std::uint64_t JoinEight(std::uint64_t bytes)
 {
-    // Two digits, four, eight: each step joins neighbours by one product.
+    // Each step joins neighbours by one product: pairs of digits, of two digits, of four.
     bytes = (bytes * (1 + (10 << 8))) >> 8 & 0x00FF'00FF'00FF'00FF;
     bytes = (bytes * (1 + (100 << 16))) >> 16 & 0x0000'FFFF'0000'FFFF;
     return (bytes * (1 + (std::uint64_t{10'000} << 32))) >> 32;
@@ -189,9 +186,9 @@ constexpr std::uint64_t JoinEight(std::uint64_t bytes)
 /// The reverse of JoinEight: the eight digits of a number below 10^8.
 constexpr std::uint64_t SplitEight(std::uint64_t number)
 {
-    // Each step divides all parts at once, by a product with the rounded-up reciprocal that is
-    // exact for parts this small. The quotient q takes the lower half of the part's room and the
-    // remainder n - q x d the upper half: together (n << half) - q x ((d << half) - 1).
+    // Each step divides all parts at once, by a product with the reciprocal, rounded up, which is
+    // exact for parts this small. The quotient q goes to the lower half of a part and the remainder
+    // n - q x d to the upper half: together (n << half) - q x ((d << half) - 1).
     const auto two = (number << 32) - number / 10'000 * ((std::uint64_t{10'000} << 32) - 1);
     const auto hundreds = ((two * 10'486) >> 20) & 0x0000'007F'0000'007F;
     const auto four = (two << 16) - hundreds * ((100 << 16) - 1);

@@ -1,6 +1,7 @@
 #include "dcm/elements/number.h"
 
 #include "dcm/elements/decimal.h"
+#include "dcm/elements/exact_decimal.h"
 #include "dcm/platform/text.h"
 #include "dcm/platform/word.h"
 
@@ -28,7 +29,7 @@ constexpr bool IsDigit(char c)
     return c >= '0' && c <= '9';
 }
 
-/// Takes a sign off the front of `text`; returns whether it was a minus sign.
+/// Removes a sign from the start of `text`; returns whether it was a minus sign.
 bool TakeSign(std::string_view& text)
 {
     const bool negative = text.starts_with('-');
@@ -40,7 +41,7 @@ bool TakeSign(std::string_view& text)
 
 constexpr std::string_view kInfinityName = "1.#INF";
 
-/// The name of the infinity or not-a-number with these bits, without its sign.
+/// The name of the infinity or not-a-number with these bits, without the sign.
 std::string_view SpecialName(std::uint64_t bits)
 {
     constexpr std::uint64_t quietBit = 0x0008'0000'0000'0000;
@@ -52,18 +53,6 @@ std::string_view SpecialName(std::uint64_t bits)
         return "1.#IND";
     }
     return (bits & quietBit) != 0 ? "1.#QNAN" : "1.#SNAN";
-}
-
-/// Writes the sixteen characters in the bytes of `text`, the lowest byte first.
-void WriteSixteen(uint128 text, char* to)
-{
-    if constexpr (std::endian::native == std::endian::little) {
-        std::memcpy(to, &text, sizeof text);
-    } else {
-        for (int i = 0; i < 16; ++i) {
-            to[i] = static_cast<char>(text >> (8 * i));
-        }
-    }
 }
 
 /// Writes "e", a sign and at least three digits.
@@ -78,61 +67,45 @@ char* WriteExponent(int exponent, char* to)
     return to + 5;
 }
 
-/// A number's significant digits, without leading zeros, and the power of ten of the last one.
-class ExactDecimal
+/// Moves the bytes of `text` from the marked one on up by one, and puts a point before them. `mark`
+/// is the lowest bit of a byte, or 0 for no change.
+constexpr std::uint64_t InsertPoint(std::uint64_t text, std::uint64_t mark)
 {
-public:
-    void Append(char digit, bool behindPoint)
-    {
-        if (m_count == 0 && digit == '0') {
-            m_exponent -= behindPoint ? 1 : 0;
-        } else if (m_count < kDigitsMax) {
-            m_text[m_count++] = digit;
-            m_exponent -= behindPoint ? 1 : 0;
-        } else {
-            m_more = m_more || digit != '0';
-            m_exponent += behindPoint ? 0 : 1;
+    const auto before = text & (mark - 1);
+    return before | (text ^ before) << 8 | mark * '.';
+}
+
+/// Writes seventeen digits: the first, eight in `upper`, eight in `lower`. A point follows the
+/// first and as many others as `point` says, from 0 to 16; below 0, "0." and zeros come before all
+/// digits. A "0" follows where the point is the last character. Returns the place of the first
+/// digit.
+char* WriteDigits(char first, std::uint64_t upper, std::uint64_t lower, int point, char* to)
+{
+    if (point >= 8) {
+        to[0] = first;
+        StoreWord(upper, to + 1);
+        StoreWord(lower, to + 10);
+        StoreWord(InsertPoint(lower, point < 16 ? std::uint64_t{1} << (8 * (point - 8)) : 0),
+                  to + 9);
+        if (point == 16) {
+            to[17] = '.';
+            to[18] = '0';
         }
+        return to;
     }
-
-    /// The magnitude times 10 to the power of `exponent`.
-    double Value(std::int64_t exponent)
-    {
-        if (m_count == 0) {
-            return 0.0;
-        }
-        exponent += m_exponent;
-        const auto magnitude = exponent + static_cast<std::int64_t>(m_count);
-        if (magnitude > 400) {
-            return std::numeric_limits<double>::infinity();
-        }
-        if (magnitude < -400) {
-            return 0.0;
-        }
-        if (m_more) { // One digit stands for all that were left out: not zero, that is enough.
-            m_text[m_count++] = '1';
-            --exponent;
-        }
-        char* const begin = m_text.data();
-        char* end = begin + m_count;
-        *end++ = 'e';
-        end = std::to_chars(end, begin + m_text.size(), exponent).ptr;
-        double value = 0.0;
-        if (std::from_chars(begin, end, value).ec == std::errc::result_out_of_range) {
-            return magnitude > 0 ? std::numeric_limits<double>::infinity() : 0.0;
-        }
-        return value;
-    }
-
-private:
-    /// No double, and no point halfway between two, has more significant digits than 767.
-    static constexpr std::size_t kDigitsMax = 768;
-
-    std::array<char, kDigitsMax + 32> m_text;
-    std::size_t m_count = 0;
-    std::int64_t m_exponent = 0;
-    bool m_more = false;
-};
+    // No branch on the point: it changes from number to number. All digits are written where they
+    // are after a point, then the upper ones once more with the point inserted.
+    constexpr char zeros[] = {'0', '.', '0', '0', '0', '0', '0', '0'};
+    std::memcpy(to, zeros, sizeof zeros);
+    const bool within = point >= 0;
+    to += within ? 0 : 1 - point;
+    to[0] = first;
+    char* const next = to + (within ? 2 : 1);
+    StoreWord(upper, next);
+    StoreWord(lower, next + 8);
+    StoreWord(InsertPoint(upper, std::uint64_t{within} << (8 * (point & 7))), to + 1);
+    return to;
+}
 
 /// The exponent at the start of `text`, "e" included; 0 when there is none.
 std::int64_t Exponent(std::string_view text)
@@ -144,7 +117,7 @@ std::int64_t Exponent(std::string_view text)
     const bool negative = TakeSign(text);
     std::int64_t exponent = 0;
     for (std::size_t i = 0; i < text.size() && IsDigit(text[i]); ++i) {
-        // More than any count of digits can make up for, and far from overflow.
+        // No count of digits makes up for more, and it is far from overflow.
         constexpr std::int64_t enough = 100'000'000'000'000'000;
         exponent = std::min(exponent * 10 + (text[i] - '0'), enough);
     }
@@ -184,8 +157,8 @@ inline const char* TakeDigits(const char* at, std::uint64_t& number)
     }
 }
 
-/// Whether what was taken from `at` to `end` is at most 19 digits, zeros in front not counted as
-/// long as the exponent stays small with them.
+/// Whether there are at most 19 digits from `at` to `end`. Leading zeros do not count, unless there
+/// are so many that the exponent could overflow.
 inline bool FitsInDecimal(const char* at, const char* end)
 {
     constexpr std::ptrdiff_t most = 19;
@@ -198,15 +171,15 @@ inline bool FitsInDecimal(const char* at, const char* end)
     return end - at <= most;
 }
 
-/// The bytes of a word with those up to the first of `others` moved up by one, over it: if that is
-/// the point, all digits are in a row then.
+/// The bytes of a word, with those before the first of `others` moved up by one, so that they
+/// overwrite it: if it is the point, the digits are then adjacent.
 inline std::uint64_t WithoutPoint(std::uint64_t bytes, std::uint64_t others)
 {
     const auto upToFirst = others ^ (others - 1);
     return (bytes & ~upToFirst) | (bytes & upToFirst >> 8) << 8;
 }
 
-/// TakeFixed for a number that goes on behind its first eight characters.
+/// TakeFixed for a number that goes on after its first eight characters.
 inline const char* TakeLong(const char* at, std::uint64_t bytes, std::uint64_t others,
                             Decimal& decimal)
 {
@@ -234,8 +207,8 @@ inline const char* TakeLong(const char* at, std::uint64_t bytes, std::uint64_t o
     return end;
 }
 
-/// Takes the digits at `at` and a point among them; returns their end, or a null pointer when there
-/// is no digit, more than one point or too many characters.
+/// Reads the digits at `at` and a point among them; returns their end, or a null pointer when there
+/// is no digit, more than one point or too many digits.
 inline const char* TakeFixed(const char* at, Decimal& decimal)
 {
     const auto bytes = DigitBytes(at);
@@ -277,8 +250,8 @@ const char* TakeExponent(const char* at, int& exponent)
     return last;
 }
 
-/// Reads the decimal number at `at` in the forms that files are full of, and returns its end. A
-/// null pointer, or an end inside the token, is for all that ReadToken must see.
+/// Reads the decimal number at `at` in the forms that are frequent in files, and returns its end.
+/// After a null pointer, or an end within the token, the token must be read by ReadToken.
 inline const char* TakeDecimal(const char* at, double& value)
 {
     const std::uint64_t negative = *at == '-' ? 1 : 0;
@@ -292,7 +265,7 @@ inline const char* TakeDecimal(const char* at, double& value)
         at = TakeExponent(at, decimal.exponent);
     }
     if (!ToDouble(decimal, value)) {
-        return nullptr;
+        value = NearestDouble(decimal);
     }
     value = std::bit_cast<double>(std::bit_cast<std::uint64_t>(value) | negative << 63);
     return at;
@@ -308,39 +281,29 @@ char* WriteNumber(double value, int digits, char* to) noexcept
     to += bits >> 63;
     const auto magnitude = bits & ~kSignBit;
     if (magnitude - 1 >= kInfinityBits - 1) {
-        return std::ranges::copy(magnitude == 0 ? "0.0"sv : SpecialName(bits), to).out;
+        const auto name = magnitude == 0 ? "0.0"sv : SpecialName(bits);
+        return std::copy(name.begin(), name.end(), to);
     }
     const auto decimal = ToDecimal(std::bit_cast<double>(magnitude), digits);
     const int exponent = decimal.exponent + digits - 1;
     // The first of seventeen digits, and the other sixteen.
     const auto whole = digits == 17 ? decimal.digits : decimal.digits * 100;
-    const auto first = static_cast<char>('0' + whole / kTenTo16);
-    const auto upper = SplitEight(whole % kTenTo16 / kTenTo8);
-    const auto lower = SplitEight(whole % kTenTo8);
-    const auto others = (uint128{lower | RepeatByte('0')} << 64) | (upper | RepeatByte('0'));
-    // The last digit that is not 0, found without a branch: long and short numbers come mixed.
+    const auto firstNine = whole / kTenTo8;
+    const auto first = firstNine / kTenTo8;
+    const auto upper = SplitEight(firstNine - first * kTenTo8);
+    const auto lower = SplitEight(whole - firstNine * kTenTo8);
+    // Up to the last digit that is not 0. No branch: long and short numbers are mixed.
     const auto used = lower != 0 ? ~std::uint64_t{0} : 0;
     const int count =
         9 + static_cast<int>(used & 8) - std::countl_zero(upper ^ ((upper ^ lower) & used)) / 8;
 
-    if (exponent < kFixedMin || exponent >= digits) {
-        to[0] = first;
-        to[1] = '.';
-        WriteSixteen(others, to + 2);
+    const bool inFixed = exponent >= kFixedMin && exponent < digits;
+    const int point = inFixed ? exponent : 0;
+    to = WriteDigits(static_cast<char>('0' + first), upper | RepeatByte('0'),
+                     lower | RepeatByte('0'), point, to);
+    if (!inFixed)
         return WriteExponent(exponent, to + (count > 1 ? count + 1 : 1));
-    }
-    // Below 1, zeros and the point stand in front of the digits. From 1 on the point goes behind as
-    // many of the others as the exponent says; those behind it move by a byte, the last one out.
-    constexpr char zeros[] = {'0', '.', '0', '0', '0'};
-    std::memcpy(to, zeros, sizeof zeros);
-    to += exponent < 0 ? 1 - exponent : 0;
-    const auto point = uint128{exponent >= 0 && exponent < 16 ? 1U : 0U} << (8 * (exponent & 15));
-    const auto front = others & (point - 1);
-    to[0] = first;
-    WriteSixteen(front | (others ^ front) << 8 | point * '.', to + 1);
-    to[17] = exponent < 16 ? static_cast<char>(others >> 120) : '.';
-    to[18] = '0';
-    return to + std::max(count, exponent + 2) + (exponent < 0 ? 0 : 1);
+    return to + std::max(count, point + 2) + (point < 0 ? 0 : 1);
 }
 
 double ReadDecimal(std::string_view text) noexcept
@@ -399,8 +362,7 @@ std::size_t NumberReader::Next(std::span<double> values) noexcept
     return static_cast<std::size_t>(to - values.begin());
 }
 
-/// The next number from a token of any kind and length; `at` becomes the start of the one behind
-/// it, or null.
+/// Reads a token of any kind and length; `at` becomes the start of the token after it, or null.
 double NumberReader::NextOfAnyKind(const char*& at) const
 {
     const std::string_view rest(at, m_end);

@@ -25,6 +25,17 @@ inline std::uint64_t LoadWord(const char* at)
     return text;
 }
 
+/// The reverse: writes the bytes of `word` as eight characters, the lowest byte first.
+inline void StoreWord(std::uint64_t word, char* to)
+{
+    if constexpr (std::endian::native == std::endian::little) {
+        std::memcpy(to, &word, sizeof word);
+    } else {
+        for (int i = 0; i < 8; ++i)
+            to[i] = static_cast<char>(word >> (8 * i));
+    }
+}
+
 /// A word of eight bytes, each of them `value`.
 constexpr std::uint64_t RepeatByte(unsigned char value)
 {
