@@ -8,7 +8,7 @@ using namespace test;
 
 namespace {
 
-/// The comment, then the names of the FESTWERT blocks.
+/// The names of the FESTWERT blocks, with the comment in front.
 std::string Content(const DCMConverter& document)
 {
     std::string names;
