@@ -1,5 +1,5 @@
-// Measures the library against what its work costs at least, and against what a host would use
-// instead. The contestants take turns, so that whatever else the machine does hits all of them.
+// Compares the library with the least time that its work needs, and with what a host would use
+// instead. The contestants take turns, so that other work of the machine affects all of them.
 
 #include "benchmarks/contestant.h"
 #include "benchmarks/temporary_folder.h"
@@ -62,9 +62,8 @@ void SetUp(Stage& stage, const std::filesystem::path& folder, Flavour flavour, d
     }
 }
 
-/// A contestant that does something else than the others is worth nothing: all who read have to
-/// get the numbers of the data, and those who write what the library writes have to write the same
-/// file.
+/// Checks that all contestants do the same: all readers must get the numbers of the data, and all
+/// writers of the library's format must write the same file.
 void Check(const Stage& stage, const Contestant& contestant, std::string& exported)
 {
     const Outcome outcome = contestant.run(stage);
@@ -80,7 +79,7 @@ void Check(const Stage& stage, const Contestant& contestant, std::string& export
     }
 }
 
-/// Collects the times of one round after the other.
+/// Collects the times of all rounds.
 class Collector : public benchmark::BenchmarkReporter
 {
 public:
@@ -121,7 +120,7 @@ void Register(const Stage& stage, const Contestant& contestant, const std::strin
     benchmark::RegisterBenchmark(name.c_str(),
                                  [&stage, &contestant](benchmark::State& state) {
                                      for ([[maybe_unused]] auto _ : state) {
-                                         // Each starts with memory fresh from the system.
+                                         // Each gets its memory from the system.
                                          malloc_trim(0);
                                          state.SetIterationTime(contestant.run(stage).seconds);
                                      }

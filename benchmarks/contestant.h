@@ -14,10 +14,10 @@
 #include <utility>
 #include <vector>
 
-/// What is measured against each other, in one program and run.
+/// The things that are compared, in one program and one run.
 namespace dcm::bench {
 
-/// What a contestant works on, and where it leaves its results.
+/// The input of a contestant, and the place for its output.
 struct Stage
 {
     Data data;
@@ -25,8 +25,8 @@ struct Stage
     Data narrowData;
     /// The same as a document.
     DCMConverter document;
-    /// Some of the numbers, few enough to stay in the processor's cache with their texts, and a
-    /// line of these texts with three blanks between them.
+    /// Some of the numbers, so few that they stay in the processor's cache with their texts, and a
+    /// line of these texts, separated by three blanks.
     std::vector<double> someNumbers;
     std::string someTexts;
     std::filesystem::path dcmFile;
@@ -34,27 +34,27 @@ struct Stage
     std::filesystem::path outputFile;
 };
 
-/// The time of one timed part, and what it came to.
+/// The time of one timed part, and its result.
 struct Outcome
 {
     double seconds = 0;
-    /// Of the numbers read; of a contestant that writes, 0.
+    /// Of the numbers read; 0 for a contestant that writes.
     std::uint64_t checksum = 0;
 };
 
 /// One way to do one thing.
 struct Contestant
 {
-    /// What is done and by what, such as "import/dcm".
+    /// What is done and what does it, such as "import/dcm".
     std::string name;
-    /// Does it once. What it made is released outside the timed part.
+    /// Does it once. The results are released after the timed part.
     std::function<Outcome(const Stage&)> run;
 };
 
 /// All contestants, in no special order.
 std::vector<Contestant>& Contestants();
 
-/// A contestant that takes part by being defined.
+/// Adds a contestant when it is constructed.
 struct TakesPart
 {
     TakesPart(std::string name, std::function<Outcome(const Stage&)> run)
@@ -63,8 +63,8 @@ struct TakesPart
     }
 };
 
-/// Calls `work` and adds the time that the processor spent on it to `seconds`. None of it waits for
-/// anything, and other programs on the same processor do not count.
+/// Calls `work` and adds its processor time to `seconds`. Nothing here waits, and other programs on
+/// the same processor do not count.
 template <class Work>
 auto Timed(double& seconds, Work work)
 {
@@ -78,13 +78,14 @@ auto Timed(double& seconds, Work work)
     return work();
 }
 
-/// How often the routines for some numbers run, to have had as many as the data have.
+/// How often the routines for single numbers run, so that they process as many numbers as the data
+/// have.
 inline std::size_t Repetitions(const Stage& stage)
 {
     return stage.data.numbers / stage.someNumbers.size();
 }
 
-/// Times `write`, which writes a number at a place in memory and returns the text's end.
+/// Times `write`, which writes the text of a number to memory and returns its end.
 template <class Character, class Write>
 Outcome TimedNumberTexts(const Stage& stage, Write write)
 {
@@ -102,7 +103,7 @@ Outcome TimedNumberTexts(const Stage& stage, Write write)
     return outcome;
 }
 
-/// What a reader other than the library makes: the numbers of each block.
+/// The result of a reader other than the library: the numbers of each block.
 using BlockNumbers = std::vector<std::vector<double>>;
 
 /// Times a reader that returns BlockNumbers.

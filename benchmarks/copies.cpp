@@ -1,5 +1,5 @@
-// Copies of documents and of their lists, against copies of the same payload: lists of blocks with
-// the same texts and with vectors of 16-byte values, and nothing else.
+// Compares copies of documents and of their lists with copies of the same payload: lists of blocks
+// with only the same texts and vectors of 16-byte values.
 
 #include "benchmarks/contestant.h"
 #include "dcm/library/dcm.h"
@@ -21,7 +21,7 @@ struct PayloadValue
 };
 static_assert(sizeof(PayloadValue) == 16);
 
-/// The texts that a block has, in no more than the room for them.
+/// The texts of a block, in memory of just their size.
 template <std::size_t N>
 std::array<CString, N> TextsOf(const Block& block)
 {
@@ -101,7 +101,7 @@ const auto kDocumentPayload = [](const Data& data) {
         PayloadOf<TextPayload>(data, "TEXTSTRING"));
 };
 
-/// Times the making of a copy, not its release.
+/// Times making a copy, without releasing it.
 template <class Copy>
 Outcome TimedCopy(Copy copy)
 {
@@ -111,7 +111,7 @@ Outcome TimedCopy(Copy copy)
     return outcome;
 }
 
-/// Times copies of a payload. It is made the first time, and is then as old as the document.
+/// Times copies of a payload, which is made at the first call.
 template <class Make>
 auto CopyOfPayload(Make make)
 {
@@ -122,7 +122,7 @@ auto CopyOfPayload(Make make)
     };
 }
 
-/// Both contestants for one Get; what comes out is a copy.
+/// Both contestants for one Get, which returns a copy.
 template <class Payload, class List>
 void CompareGet(std::string_view keyword, List (DCMConverter::*get)() const)
 {

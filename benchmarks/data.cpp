@@ -13,8 +13,8 @@ namespace {
 
 constexpr int kNumbersPerLine = 6;
 
-/// Makes up blocks. Draws come from the engine directly: the library's distributions differ from
-/// system to system.
+/// Generates blocks. Random numbers are taken from the engine directly, because the distributions
+/// of the standard library differ from system to system.
 class Generator
 {
 public:

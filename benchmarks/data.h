@@ -7,12 +7,12 @@
 #include <string_view>
 #include <vector>
 
-/// The generated data that everything is measured on.
+/// The generated data that all measurements use.
 namespace dcm::bench {
 
 enum class Flavour
 {
-    kShort, ///< One to five significant digits, as tools write them.
+    kShort, ///< One to five significant digits, as tools write.
     kFull,  ///< 17 significant digits.
 };
 
@@ -53,7 +53,7 @@ struct Data
 /// the same arguments, on every machine.
 Data MakeData(Flavour flavour, double factor, std::uint64_t seed = 1);
 
-/// The text of `number` as it stands in the files.
+/// The text of `number` in the files.
 void AppendNumber(std::string& text, double number, Flavour flavour);
 
 /// The data as a file in DCM format, in code page 1252: six numbers a line, CR LF.
@@ -68,8 +68,7 @@ Data In1252(Data data);
 /// `text`, of characters below U+0100 in UTF-8, in code page 1252.
 std::string To1252(std::string_view text);
 
-/// Tells whether two readers got the same numbers, in whatever order they hold them: the sum of
-/// the numbers' bits.
+/// The sum of the numbers' bits, to check that two readers got the same numbers, in any order.
 class Checksum
 {
 public:

@@ -1,5 +1,5 @@
-// Imports texts that are made to be slow to read, at one size and at eight times that size, and
-// fails when the time grows faster than the text, or the memory with it.
+// Imports texts that are made to be slow to read, at one size and at eight times that size. Fails
+// when time or memory grow faster than the text.
 
 #include "benchmarks/contestant.h"
 #include "benchmarks/memory.h"
@@ -23,22 +23,22 @@ namespace {
 
 using namespace dcm::bench;
 
-/// Times at eight times the size may be this many times as long.
+/// The most that the time at eight times the size may be, as a multiple.
 constexpr double kGrowthLimit = 12;
 
-/// Memory that an import may need for each byte of the file, beside what the blocks hold.
+/// The most memory that an import may need for each byte of the file, in addition to its blocks.
 constexpr double kMemoryLimit = 12;
 
 /// The smaller size: large enough that both get their memory from the system.
 constexpr std::size_t kBytes = 1U << 20U;
 
-/// `before`, then `unit` as often as the size demands, then `behind`.
+/// `before`, then `unit` repeated up to the size, then `after`.
 struct HostileText
 {
     std::string_view name;
     std::string_view before;
     std::string_view unit;
-    std::string_view behind;
+    std::string_view after;
 };
 
 constexpr HostileText kTexts[] = {
@@ -71,7 +71,7 @@ std::size_t Excess(std::size_t value, std::size_t base)
     return value > base ? value - base : 0;
 }
 
-/// A hostile text in a file, and what it costs.
+/// A hostile text in a file, and the time and memory of its import.
 class Trial
 {
 public:
@@ -82,16 +82,16 @@ public:
         file << text.before;
         for (std::size_t size = 0; size < bytes; size += text.unit.size())
             file << text.unit;
-        file << text.behind;
+        file << text.after;
     }
 
     std::size_t FileSize() const { return std::filesystem::file_size(m_path); }
 
     struct Memory
     {
-        /// On top of what the process had before.
+        /// In addition to what the process used before.
         std::size_t peak;
-        /// What is left of it in the blocks.
+        /// The part of it that the blocks use.
         std::size_t held;
     };
     Memory MeasureMemory() const
@@ -144,8 +144,8 @@ struct Verdict
     double memory;
 };
 
-/// Whether freed memory stays with the process, or large pieces of it go back to the system as they
-/// usually do.
+/// Sets whether the process keeps freed memory, or returns large pieces to the system, as is the
+/// default.
 void KeepFreedMemory(bool keep)
 {
     mallopt(M_MMAP_THRESHOLD, keep ? 1 << 30 : 1 << 17);
@@ -159,7 +159,7 @@ Verdict Judge(const HostileText& text, const std::filesystem::path& folder)
     KeepFreedMemory(false);
     const Trial::Memory memory = large.MeasureMemory();
 
-    // Otherwise the larger size would be charged for what the system takes to hand memory out.
+    // Otherwise the time of the larger size would include that for getting memory from the system.
     KeepFreedMemory(true);
     large.MeasureTimes();
     std::vector<double> importGrowth;

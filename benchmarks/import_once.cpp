@@ -1,6 +1,6 @@
 // import_once dcm|floor FILE
-// What the first reading of a file costs in a fresh process, that of a host of the shared library:
-// prints its time in seconds and the peak memory of the process in bytes.
+// Reads a file once in a new process that uses the shared library. Prints the time in seconds and
+// the peak memory of the process in bytes.
 
 #include "benchmarks/memory.h"
 #include "benchmarks/plain.h"

@@ -1,6 +1,6 @@
 // instructions WHAT FILE
-// Does one thing with the numbers of a file, under valgrind's callgrind, which counts the
-// instructions of just that. Prints over how many numbers they are to be shared out.
+// Does one thing with the numbers of a file under valgrind's callgrind, which counts the
+// instructions of that alone. Prints the number of numbers, to divide by.
 
 #include "benchmarks/plain.h"
 #include "benchmarks/temporary_folder.h"
@@ -20,8 +20,7 @@ namespace {
 
 using namespace dcm::bench;
 
-/// Counts the instructions of `work`. The counting is switched on for no more than this, because
-/// it makes a program slow.
+/// Counts the instructions of `work`. Counting is switched on only for this, because it is slow.
 template <class Work>
 void Counted(Work work)
 {

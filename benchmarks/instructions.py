@@ -17,7 +17,7 @@ FLAVOURS = ("full", "short")
 KEPT = ("import", "export", "text", "token")
 BAND = 0.03
 FACTOR = 0.1
-# The C library picks its string functions by the processor; these are everybody's.
+# The C library chooses its string functions by the processor; these are in every one.
 PLAIN = "glibc.cpu.hwcaps=-AVX2,-AVX,-AVX_Fast_Unaligned_Load,-EVEX,-AVX512VL,-ERMS,-FSRM,-SSSE3"
 
 

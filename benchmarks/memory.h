@@ -7,7 +7,7 @@
 /// The memory of this process, as the system counts it.
 namespace dcm::bench {
 
-/// A figure of /proc/self/status such as "VmHWM", in bytes; 0 where the system does not tell.
+/// A figure of /proc/self/status such as "VmHWM", in bytes; 0 when the system does not have it.
 inline std::size_t MemoryFigure(const std::string& name)
 {
     std::ifstream status("/proc/self/status");
@@ -20,7 +20,7 @@ inline std::size_t MemoryFigure(const std::string& name)
     return 0;
 }
 
-/// The most memory that the process has had at any time, or since ForgetPeakMemory.
+/// The most memory that the process has used since its start or since ForgetPeakMemory.
 inline std::size_t PeakMemory()
 {
     return MemoryFigure("VmHWM");

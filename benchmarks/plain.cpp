@@ -19,7 +19,7 @@ struct FileCloser
 };
 using File = std::unique_ptr<std::FILE, FileCloser>;
 
-/// A file without a buffer of its own, so that each call reaches the system.
+/// A file without a buffer, so that each call is a system call.
 File OpenFile(const std::filesystem::path& path, const char* mode)
 {
     File file(std::fopen(path.c_str(), mode));
@@ -29,7 +29,7 @@ File OpenFile(const std::filesystem::path& path, const char* mode)
     return file;
 }
 
-/// The text in front of the first `separator`, which is removed with it.
+/// Removes the text before the first `separator`, and the separator, and returns the text.
 template <class View>
 View TakeUntil(View& rest, typename View::value_type separator)
 {
@@ -39,7 +39,7 @@ View TakeUntil(View& rest, typename View::value_type separator)
     return part;
 }
 
-/// The first word of `rest` and the blanks around it are removed.
+/// Removes the first word of `rest` and the blanks around it and returns the word.
 template <class View>
 View TakeWord(View& rest)
 {
@@ -48,7 +48,7 @@ View TakeWord(View& rest)
     return TakeUntil(rest, typename View::value_type{' '});
 }
 
-/// The naive host: a stream of wide lines, a string a word.
+/// The naive host: a stream of wide lines, one string for each word.
 BlockNumbers ReadNaively(const std::filesystem::path& path)
 {
     const FileBytes file = ReadFile(path);
@@ -84,7 +84,7 @@ BlockNumbers ReadNaively(const std::filesystem::path& path)
     return blocks;
 }
 
-/// Appends numbers as std::to_chars or std::snprintf write them.
+/// Appends numbers with std::to_chars or std::snprintf.
 enum class Digits
 {
     kToChars,

@@ -7,8 +7,8 @@
 #include <memory>
 #include <string_view>
 
-/// Reading and writing with nothing but the standard library: what the work costs at least, and
-/// what it costs a host that does it by hand.
+/// Reading and writing with the standard library alone: the least time that the work needs, and the
+/// time of a host that does it in the simplest way.
 namespace dcm::bench {
 
 /// The bytes of a whole file.

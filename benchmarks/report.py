@@ -17,8 +17,8 @@ CHART = pathlib.Path("docs/images/performance.svg")
 FLAVOURS = ("full", "short")
 LARGE = 8
 
-# What is measured, against what, the two figures, and the limits of their ratio, full and short;
-# None where nothing is promised. A limit below 0 is a speed: "3.2 times as fast" is -3.2.
+# What is measured, what it is compared with, the two figures, and the limits of their ratio, full and
+# short; None for no limit. A limit below 0 is a speed: "3.2 times as fast" is -3.2.
 ROWS = [
     ("import", "reading floor", "import/dcm", "import/floor", (1.0, 1.1)),
     ("import", "simdjson DOM, copied out", "import/dcm", "import/simdjson", (1.0, 0.9)),
@@ -90,7 +90,7 @@ def measure(rounds):
         results[flavour].update(measure_in_fresh_processes(flavour, rounds))
     for (what, flavour), figure in instructions.count_all((*instructions.KEPT, "floor")).items():
         results[flavour]["instructions/" + what] = [figure]
-    # Exits with a failure when a limit is passed, which the table shows as well.
+    # Its exit status is a failure when a limit is exceeded; the table shows that too.
     hostile = subprocess.run([BUILD / "benchmarks/dcm_hostile"], stdout=subprocess.PIPE,
                              stderr=subprocess.DEVNULL, check=False)
     for name, figure in json.loads(hostile.stdout).items():
@@ -100,7 +100,7 @@ def measure(rounds):
 
 
 def ratio(figures, name, against):
-    """The median of the ratio over the rounds; None when one of the two did not take part."""
+    """The median of the ratio over the rounds; None when one of the two was not measured."""
     if name not in figures or against not in figures:
         return None
     return statistics.median(a / b for a, b in zip(figures[name], figures[against]))
@@ -143,7 +143,7 @@ def processor():
 
 
 def write_page(results):
-    """Replaces the figures on the page, which stand between two comments, and draws the chart."""
+    """Replaces the figures on the page, which are between two comments, and draws the chart."""
     medians = {
         flavour: {name: statistics.median(values) for name, values in figures.items()}
         for flavour, figures in results.items()

@@ -7,7 +7,7 @@
 
 namespace dcm::bench {
 
-/// A new folder, in memory where the system offers that, which goes with the object.
+/// A new folder, in memory if the system can. The destructor removes it.
 class TemporaryFolder
 {
 public:

@@ -1,8 +1,8 @@
-# Debian packages by CPack: libdcm1 to run hosts, libdcm-dev to build them. The Debian revision and
-# the packager's address may be set; scripts/package builds and checks them.
+# Debian packages by CPack: libdcm1 to run hosts, libdcm-dev to build them. scripts/package builds and
+# checks them.
 set(DCM_DEBIAN_REVISION 1 CACHE STRING "Revision of the Debian packages")
 set(DCM_DEBIAN_MAINTAINER "The dcm project <dcm@dcm.invalid>" CACHE STRING
-    "Who answers for the Debian packages")
+    "Maintainer of the Debian packages")
 
 include(GNUInstallDirs)
 
@@ -43,7 +43,7 @@ CMake package and the pkg-config file.")
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_DEPENDS
     "${runtime} (= ${PROJECT_VERSION}-${DCM_DEBIAN_REVISION})")
 
-# What every Debian package has beside its files.
+# The documents that every Debian package has.
 string(TIMESTAMP DCM_DEBIAN_DATE "%a, %d %b %Y %H:%M:%S +0000" UTC)
 set(documents ${PROJECT_BINARY_DIR}/debian)
 configure_file(cmake/debian/changelog.in ${documents}/changelog.Debian @ONLY)

@@ -1,6 +1,6 @@
-// Each kind of block reads any text, twice over, and is copied and written. The first byte chooses
-// the kind (the letters from B on are the kinds in their order, and the format's version), the
-// others are the text in UTF-8, zeros included.
+// A block of each kind reads any text, twice, and is copied and written. The first byte chooses the
+// kind (the letters from B on: the kinds in their order, then the version of the format). The other
+// bytes are the text in UTF-8, including zeros.
 
 #include "fuzz/target.h"
 

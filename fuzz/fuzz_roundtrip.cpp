@@ -1,5 +1,5 @@
-// Any file is read; what is written from it reads back and is written again. A document that is
-// settled, in the sense below, gives the same bytes both times.
+// Reads any file, writes it, reads the written file and writes it again. A document that is
+// settled, as defined below, gives the same bytes both times.
 
 #include "fuzz/target.h"
 
@@ -8,8 +8,8 @@
 
 namespace {
 
-/// Whether the texts come back as they are: at their ends the reader takes white space and quotes
-/// off, a backslash keeps a quote from closing, and a truth word becomes a number.
+/// Whether the texts are read back unchanged: the reader removes white space and quotes at their
+/// ends, a quote after a backslash does not close a text, and `true` and `false` become numbers.
 bool AreSettled(std::initializer_list<std::wstring_view> texts)
 {
     constexpr std::wstring_view kLost = L" \t\n\v\f\r\"\\";
@@ -29,8 +29,8 @@ bool IsSettled(const DCMFestwert& block)
                        value.vt == VT_BSTR ? CComVariant::TextOf(value) : std::wstring_view()});
 }
 
-/// An empty text and a quote can join texts. Rows have 15 digits: numbers at the limit of the range
-/// round up to infinity. Without a name, the count is taken for it.
+/// An empty text or a quote can join texts. Rows have 15 digits: numbers at the limit of the range
+/// are rounded to infinity. Without a name, the count is read as the name.
 bool IsSettled(const DCMFestwerteblock& block)
 {
     const auto numbers = block.GetDoubleValues();
@@ -55,15 +55,15 @@ bool IsSettled(const DCMKennlinie&)
     return true;
 }
 
-/// Points of a second type move the rows. Without a name, a count is taken for it.
+/// Points of a second type shift the rows. Without a name, a count is read as the name.
 bool IsSettled(const DCMKennfeld& block)
 {
     return !block.GetName().IsEmpty() && block.GetAxis_XType() != VT_ERROR &&
            block.GetAxis_YType() != VT_ERROR && block.GetValueType() != VT_ERROR;
 }
 
-/// Looks at every block. Returns whether all are settled, and how many there are of the kinds that
-/// are always written: a map with too few values is not.
+/// Returns whether all blocks are settled. Appends the number of blocks of each kind that is always
+/// written; a map with too few values is not.
 bool IsSettled(const DCMConverter& document, std::vector<std::size_t>& counts)
 {
     bool settled = true;
@@ -82,7 +82,7 @@ bool IsSettled(const DCMConverter& document, std::vector<std::size_t>& counts)
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
     const CString& file = MemoryFile();
-    // A control character in front chooses another code page than the usual one.
+    // A control character at the start chooses a code page other than the default.
     constexpr unsigned pages[] = {1252, 28591, 65001, 932, 500};
     const std::size_t choice = size > 0 && *data < std::size(pages) ? *data : 0;
     Require(dcm::SetThreadCodePage(pages[choice]), "the code page is known");

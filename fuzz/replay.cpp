@@ -1,4 +1,4 @@
-// Runs a target over the files of a folder, without libFuzzer.
+// Runs a target on each file of a folder, without libFuzzer.
 
 #include "fuzz/target.h"
 

@@ -11,14 +11,14 @@
 /// Runs the target on one input; libFuzzer, or the program that replays files, calls it.
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size);
 
-/// The path of a file in memory, so that a target is not slowed down by the disk.
+/// The path of a file in memory, which is faster than one on a disk.
 inline const CString& MemoryFile()
 {
     static const CString path(L"/proc/self/fd/" + std::to_wstring(memfd_create("dcm", 0)));
     return path;
 }
 
-/// Ends the process with a finding unless `holds`.
+/// Aborts the process unless `holds`.
 inline void Require(bool holds, const char* what)
 {
     if (holds)

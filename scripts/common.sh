@@ -1,10 +1,10 @@
 # shellcheck shell=bash
-# What the scripts share; they source it right after `set -euo pipefail`.
+# Functions that the scripts share. They source this file right after `set -euo pipefail`.
 
 cd "$(dirname "${BASH_SOURCE[0]}")/.." || exit
 export CMAKE_BUILD_PARALLEL_LEVEL=${CMAKE_BUILD_PARALLEL_LEVEL:-$(nproc)}
 
-# Runs a command and shows what it printed only if it failed.
+# Runs a command and prints its output only if it fails.
 quietly() {
     local log
     log=$(mktemp)

@@ -1,31 +1,29 @@
-// Each allocation of the library's calls fails once: all that the test executable allocates comes
-// from the operators here.
+// Each allocation in the library's calls fails once. The operators here make all allocations of the
+// test executable.
 #include "tests/support.h"
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <atomic>
 #include <cstdlib>
 #include <functional>
 #include <new>
-#include <span>
-#include <vector>
 
 using namespace test;
 
 namespace {
 
-/// How many pieces of memory are in use.
+/// The number of allocations that have not been released.
 constinit std::atomic<long> live = 0;
-/// Which of the thread's allocations from now on fails; 0 or less for none.
+/// The thread's allocation that fails, counted from now; 0 or less for none.
 constinit thread_local long untilFailure = 0;
-/// How much memory the thread has asked for.
+/// The number of bytes that the thread has requested.
 constinit thread_local std::size_t wanted = 0;
 
 } // namespace
 
-// Inlined, they would look to the compiler as if memory were freed in another way than it was got.
+// If they were inlined, the compiler would warn that memory from one function is released by
+// another.
 [[gnu::noinline]] void* operator new(std::size_t size, const std::nothrow_t&) noexcept
 {
     wanted += size;
@@ -65,9 +63,9 @@ struct State
     CString text{L"before"};
 };
 
-/// Runs an operation again and again, each time with the next of its allocations failing, until it
-/// needs no more. A failure is raised and leaves the target as it was, or is the result and leaves
-/// whole blocks; nothing leaks.
+/// Repeats an operation; each time the next of its allocations fails, until none is left to fail.
+/// With `raises` a failure is thrown and leaves the target unchanged. Otherwise it is the result,
+/// and the target has whole blocks. Nothing leaks.
 void FailEach(const char* name, bool raises, const std::function<void(State&)>& operation)
 {
     SCOPED_TRACE(name);
@@ -160,7 +158,7 @@ TEST(Allocation, FailureIsRaisedByTheOtherCalls)
                  block.Init(L"FESTWERT n\nTEXT \"text\"\n");
                  block.SetValue(s.value);
              } catch (const std::bad_alloc&) {
-                 // From the line of the text on.
+                 // Once the name is read, only storing a text can fail.
                  EXPECT_EQ(block.GetValueType(), block.GetName().IsEmpty() ? VT_EMPTY : VT_ERROR);
                  throw;
              }
@@ -178,38 +176,6 @@ TEST(Allocation, FailureIsRaisedByTheOtherCalls)
     };
     for (const auto& [name, operation] : cases)
         FailEach(name, true, operation);
-}
-
-TEST(Allocation, FailureIsRaisedByTheCallsForParameters)
-{
-    static std::vector<dcm::Parameter> parameters;
-    DCMConverter document;
-    ASSERT_EQ(ImportBytes(document, ReadBytes(CString(DCM_ALL_KINDS))), S_OK);
-    parameters = dcm::ParametersOf(document);
-    // One of each kind, the last, which has the most content.
-    for (const dcm::Kind kind : dcm::kKinds) {
-        const auto last = std::find_if(parameters.rbegin(), parameters.rend(),
-                                       [&](const auto& p) { return p.kind == kind; });
-        ASSERT_NE(last, parameters.rend());
-        FailEach(dcm::ToUtf8(dcm::KeywordOf(kind)).c_str(), true,
-                 [&](State& s) { dcm::Add(s.target, *last); });
-        FailEach("by moving", true, [&](State& s) { dcm::Add(s.target, dcm::Parameter(*last)); });
-    }
-    FailEach("parameters", true, [](State& s) { dcm::ParametersOf(s.source); });
-    FailEach("parameters by moving", true,
-             [](State& s) { dcm::ParametersOf(DCMConverter(s.source)); });
-    // Two that are removed, and others that have the content of another one.
-    static std::vector<dcm::Parameter> others(parameters.begin() + 2, parameters.end());
-    for (std::size_t i = 0; i + 1 < others.size(); ++i) {
-        others[i].x = parameters[i].x;
-        others[i].values = parameters[i].values;
-        others[i].function = parameters[i].function;
-    }
-    FailEach("differences", true, [](State&) { dcm::Differences(parameters, others); });
-    FailEach("additions", true, [](State&) { dcm::Differences({}, others); });
-    FailEach("comment", true, [](State&) { dcm::HeaderOfComment(L"a long comment\n* of lines"); });
-    parameters.clear();
-    others.clear();
 }
 
 TEST(Allocation, IsNotForPointsThatABlockCannotHold)

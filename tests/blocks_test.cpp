@@ -8,7 +8,7 @@ using namespace test;
 
 namespace {
 
-/// Those of the fields that are not empty, each after its label.
+/// The fields that are not empty, each after its label.
 template <class Value, class... Rest>
 std::string Fields(const char* label, const Value& value, const Rest&... rest)
 {

@@ -8,7 +8,7 @@ using namespace test;
 
 namespace {
 
-/// The names of the FESTWERT blocks, with the comment in front.
+/// The comment, then the names of the FESTWERT blocks.
 std::string Content(const DCMConverter& document)
 {
     std::string names;

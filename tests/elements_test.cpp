@@ -1,5 +1,5 @@
-// What a host sets in a block, gets from it and finds written; what a block's text reads as stands
-// in blocks_test.cpp.
+// What a host sets in a block, gets from it and finds in the file. How a block's text is read is
+// tested in blocks_test.cpp.
 #include "tests/support.h"
 
 #include <gtest/gtest.h>
@@ -143,7 +143,7 @@ TEST(Curve, KeepsTwoStoresAndTwoNames)
     DCMGruppenkennlinie curve;
     curve.Init(L"GRUPPENKENNLINIE K 0\n*SSTX Load\nST/X 0\nTEXT \"a\"\n");
     EXPECT_EQ(curve.GetAxisType() + curve.GetValueType(), VT_R8 + VT_BSTR);
-    // The host's own numbers are no part of the block, and their keywords know only one spelling.
+    // The host's own numbers are not part of the block, and their keywords have only one spelling.
     for (const wchar_t* keyword : {L"ST/X", L"WERT", L"st/x", L"Wert", L"TEXT"})
         curve.AddValue(8.0, keyword);
     curve.AddAxis(CComVariant(1.0));

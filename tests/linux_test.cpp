@@ -20,24 +20,24 @@ using namespace test;
 
 namespace {
 
-/// What happens to one call of the system.
+/// A fault in calls of one system function.
 struct Fault
 {
     const char* call = "";
-    /// Which of the calls it meets; 0 for every one.
+    /// The number of the call that has the fault; 0 for every call.
     int number = 0;
-    /// The error that the call comes back with; 0 for none.
+    /// The error that the call reports; 0 for none.
     int error = 0;
-    /// How many bytes it transfers at most.
+    /// The most bytes that the call transfers.
     std::size_t most = 0;
 };
 
 Fault fault;
 int calls = 0;
-/// Whether writing only looks as if it had happened.
+/// Whether `write` reports success without writing.
 bool writesNothing = false;
 
-/// The count of bytes that may be transferred; negative when the call fails.
+/// The number of bytes that the call may transfer; negative when it fails.
 ssize_t Room(std::string_view call, std::size_t count)
 {
     if (call != fault.call || (++calls != fault.number && fault.number != 0))
@@ -52,7 +52,7 @@ ssize_t Room(std::string_view call, std::size_t count)
 
 extern "C" {
 
-// A call that can fail or transfers only as much as there is room for.
+// Replaces a system call by one that may fail or transfer less.
 #define DCM_TEST_WRAP(Result, call, count, parameters, arguments)                                  \
     Result __real_##call parameters;                                                               \
     Result __wrap_##call parameters                                                                \
@@ -93,8 +93,8 @@ int __wrap_close(int file)
 
 namespace {
 
-/// Runs `operation` under the fault and returns whether the fault came to pass. No file stays open
-/// or locked.
+/// Runs `operation` with the fault and returns whether the fault happened. `operation` must leave
+/// no more files open than before.
 bool Under(const Fault& wanted, const std::function<void()>& operation)
 {
     const auto openFiles = [] {
@@ -111,7 +111,7 @@ bool Under(const Fault& wanted, const std::function<void()>& operation)
 
 constexpr HRESULT kFailed = E_UNEXPECTED;
 
-/// A child process: runs `operation` at its start and lives until the object goes.
+/// A child process that runs `operation` first and ends in the destructor.
 class Child
 {
 public:
@@ -150,7 +150,8 @@ private:
 
 TEST(FileFault, OfEachCallIsReported)
 {
-    // What an export and an import return, and whether all is read; most calls are made by both.
+    // The results of an export and of an import, and whether the import reads everything. Most
+    // calls are made by both.
     const std::tuple<Fault, HRESULT, HRESULT, bool> cases[] = {
         {{"open", 1, EMFILE}, kFailed, kFailed, false},
         {{"fstat", 1, EIO}, kFailed, kFailed, false},
@@ -182,7 +183,7 @@ TEST(FileFault, OfEachCallIsReported)
         HRESULT result = S_OK;
         bool met = Under(one, [&] { result = source.Export(path); });
         EXPECT_EQ(result, exported);
-        // An export asks for the status itself, and without an answer writes nothing.
+        // When the export's own request for the status fails, it writes nothing.
         EXPECT_TRUE(result != S_OK || ReadBytes(path) == (one.number == 3 ? "" : bytes));
         EXPECT_TRUE(bytes.starts_with(ReadBytes(path))) << "what was written before stays";
         EXPECT_EQ(ExportBytes(source, path), bytes);
@@ -266,7 +267,7 @@ TEST(LinuxFile, RefusesPipesAndWhatItMayNotOpen)
     WriteBytes(closed, "FESTWERT a\n\n");
     std::filesystem::permissions(PathOf(closed), std::filesystem::perms::none);
     const int reader = open(PathOf(pipe).c_str(), O_RDONLY | O_NONBLOCK);
-    // Permissions hold for everybody but root.
+    // Permissions do not apply to root.
     const uid_t user = geteuid();
     for (const UINT flags : {kRead, kCreate}) {
         EXPECT_EQ(CauseOf(pipe, flags), CFileException::accessDenied);
@@ -293,7 +294,7 @@ TEST(LinuxFile, IsFreeAfterItsCloseWhileAChildLives)
         byDestructor ? file.reset() : file->Close();
         EXPECT_EQ(CauseOf(path, kRead), CFileException::none) << byDestructor;
     }
-    // What the child closes stays the parent's.
+    // When the child closes the file, it stays open in the parent.
     CFile file(path, kRead);
     const Child child([&] { file.Close(); });
     EXPECT_EQ(CauseOf(path, kCreate), CFileException::sharingViolation);

@@ -1,5 +1,5 @@
-// A host that is the class library itself: the calls that the library makes when it is loaded and
-// unloaded arrive here. It ends with the number of the first promise not kept, 0 for none.
+// A host that defines the functions which the library calls when it is loaded and unloaded. The
+// exit status is the number of the first check that fails, 0 for none.
 #include "dcm/platform/module.h"
 
 #include <dlfcn.h>

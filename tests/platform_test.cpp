@@ -11,7 +11,7 @@ using namespace test;
 
 TEST(Text, SharesItsCharactersUntilOneCopyChanges)
 {
-    // Even the keywords' own memory, which no string may write to.
+    // The second text is a keyword constant, whose memory must not be written to.
     for (const CString& first : {CString(L"WERT"), CString(dcm::keyword::kWert)}) {
         CString text(first), other(first);
         EXPECT_EQ(text.View().data(), first.View().data());
@@ -155,7 +155,7 @@ TEST(File, KeepsOthersOutWhileItIsOpen)
         for (const UINT second : {kRead, UINT{CFile::modeReadWrite}, kCreate}) {
             CFile holder(path, first);
             EXPECT_EQ(CauseOf(path, second), CFileException::sharingViolation) << second;
-            // What was refused neither emptied the file nor took it from its holder.
+            // The refused open neither emptied the file nor ended its exclusive use.
             EXPECT_EQ(holder.GetLength(), 4U);
             CFileException error;
             EXPECT_FALSE(CFile().Open(path, second, &error));
@@ -176,7 +176,7 @@ TEST(File, SaysWhyItCannotBeOpened)
     EXPECT_EQ(CauseOf(large, CFile::modeCreate), CFileException::fileTooLarge);
     EXPECT_EQ(CauseOf(large, CFile::modeWrite), CFileException::fileTooLarge);
     EXPECT_EQ(std::filesystem::file_size(PathOf(large)), 1ULL << 31);
-    ASSERT_EQ(DCMConverter().Export(large), S_OK) << "what is emptied may have any size";
+    ASSERT_EQ(DCMConverter().Export(large), S_OK) << "a file that is emptied may have any size";
     EXPECT_EQ(ReadBytes(large), ExportBytes(DCMConverter()));
     EXPECT_EQ(CauseOf(folder / L"missing", CFile::modeWrite), CFileException::fileNotFound);
     EXPECT_EQ(CauseOf(folder / L"", kCreate), CFileException::accessDenied);
@@ -209,7 +209,7 @@ TEST(File, ReadsAndWritesWhatItsFlagsSay)
     const CString path = folder / L"file";
     CFile file(path, kCreate);
     file.Write("abcdef", 6);
-    EXPECT_TRUE(file.Open(path, CFile::modeWrite)) << "what is open before is closed first";
+    EXPECT_TRUE(file.Open(path, CFile::modeWrite)) << "the open file is closed first";
     file.Write("XY", 2);
     EXPECT_TRUE(file.Open(path, CFile::modeReadWrite));
     char bytes[8] = {};
@@ -234,7 +234,7 @@ TEST(File, ReadsAndWritesWhatItsFlagsSay)
     EXPECT_EQ(file.Read(bytes, 8), 0U);
 }
 
-TEST(Modules, StandInTheListWhileTheyAreLoaded)
+TEST(Modules, AreInTheListWhileTheyAreLoaded)
 {
     CDynLinkLibrary* const before = CDynLinkLibrary::Last();
     AFX_EXTENSION_MODULE one, two;

@@ -59,7 +59,7 @@ TEST(TextFile, OpensAnewWithOrWithoutSuccess)
         EXPECT_EQ(file.ReadLine(line), 1);
         EXPECT_EQ(line, L"a1");
     }
-    // A class of the host may load the text once more, from where the file was read to.
+    // A host's class may load the text again. The file has been read to its end by then.
     struct HostFile : PravFile
     {
         using PravFile::LoadContent, PravFile::PravFile;
@@ -86,5 +86,5 @@ TEST(TextFile, ConvertsLongTextWhole)
     dcm::SetThreadCodePage(1252);
     CString line;
     EXPECT_EQ(file.ReadLine(line), 1);
-    EXPECT_TRUE(line == text) << "the page that counts is the one at the time of opening";
+    EXPECT_TRUE(line == text) << "the code page is the one at the time of opening";
 }

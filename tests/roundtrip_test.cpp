@@ -6,7 +6,7 @@
 
 using namespace test;
 
-// Tests that run at the same time share this file, which an import keeps for itself: they copy it.
+// Tests that run at the same time share this file. An import opens it exclusively, so they copy it.
 static const CString kAllKinds(DCM_TEST_DATA "/all_kinds.dcm");
 
 TEST(RoundTrip, BringsEveryKindBack)
@@ -43,7 +43,8 @@ TEST(RoundTrip, SurvivesAFileCutAtEveryByte)
         ASSERT_EQ(document.Import(cut), S_OK) << rest;
         ASSERT_LE(document.GetFestwerte().size(), blocks) << rest;
         blocks = document.GetFestwerte().size();
-        // With an empty line the cut block is read too: only a WERT line without a value ends it.
+        // With an empty line added the cut block is read too. Only a WERT line without a value
+        // fails.
         const bool readable = ImportBytes(document, rest + "\n\n", closed) == S_OK;
         ASSERT_TRUE(readable || rest.ends_with("WERT ")) << rest;
     }
@@ -57,7 +58,7 @@ TEST(Threads, UseDocumentsOfTheirOwn)
     const auto work = [&](unsigned codePage) {
         ASSERT_TRUE(dcm::SetThreadCodePage(codePage));
         for (int pass = 0; pass < 20; ++pass) {
-            // Copies of one document share their texts, which each thread changes for itself.
+            // Copies of a document share their texts. Each thread changes its own copy.
             DCMConverter document(shared);
             DCMFestwert block = shared.GetFestwerte().front();
             block.GetName() += L"_changed";

@@ -28,7 +28,7 @@ namespace test {
 inline constexpr UINT kRead = CFile::modeRead;
 inline constexpr UINT kCreate = CFile::modeCreate | CFile::modeWrite;
 
-/// A folder that goes with the object and all that is in it.
+/// A new folder. The destructor removes it with all that is in it.
 class Folder
 {
 public:
@@ -82,8 +82,8 @@ inline std::string Replaced(std::string text, std::string_view from, std::string
     return text;
 }
 
-/// What a text in a file of data/ stands for: a middle dot is a blank, an arrow a tab, an arrow
-/// down a vertical tab, a pilcrow a carriage return.
+/// Replaces the marks in a text of a file in data/: a middle dot by a blank, an arrow by a tab, an
+/// arrow down by a vertical tab, a pilcrow by a carriage return.
 inline std::string Unmarked(std::string text)
 {
     for (const auto& [mark, meant] :
@@ -92,8 +92,8 @@ inline std::string Unmarked(std::string text)
     return text;
 }
 
-/// The words of each line in a file of data/, where two single quotes stand for an empty one; lines
-/// that begin with # are comments.
+/// The words of each line of a file in data/; two single quotes are an empty word. Lines that begin
+/// with # are comments.
 inline std::vector<std::vector<std::string>> Rows(const CString& path)
 {
     std::istringstream lines(ReadBytes(path));
@@ -117,7 +117,7 @@ inline std::string Narrow(std::wstring_view text)
     return std::string(dcm::ToThreadCodePage(builder.Append(text).Bytes(), converted));
 }
 
-/// What a block writes, with single line feeds. `block` is changed as its export changes it.
+/// What a block writes, with single line feeds. An export may change `block`.
 template <class Block>
 std::string Written(Block&& block, const CString& path = Folder() / L"block")
 {
@@ -143,8 +143,8 @@ inline std::string ExportBytes(const DCMConverter& document,
     return document.Export(path) == S_OK ? ReadBytes(path) : "failed";
 }
 
-/// Calls `visit` with each kind's keyword, with what gets its blocks from a document and with what
-/// adds one.
+/// Calls `visit` for each kind: with its keyword, the member of the document that gets its blocks
+/// and the one that adds a block.
 template <class Visitor>
 void ForEachKind(Visitor visit)
 {
@@ -178,8 +178,8 @@ inline std::string Show(double value)
     return {text, std::to_chars(text, text + sizeof text, value).ptr};
 }
 
-/// A number as it is, a text in single quotes (just "-" when absent), else the tag in
-/// brackets, with a mark behind it if there is a value.
+/// A number as it is, a text in single quotes ("-" when it is null), any other value as its tag in
+/// brackets, followed by "=" unless the value is 0.
 inline std::string Show(const VARIANT& value)
 {
     if (value.vt == VT_R8)
@@ -189,7 +189,7 @@ inline std::string Show(const VARIANT& value)
     return value.bstrVal == nullptr ? "-" : Show(CString(CComVariant::TextOf(value)));
 }
 
-/// The items of a list, one blank between two.
+/// The items of a list, separated by blanks.
 template <class List>
 std::string ShowAll(const List& items)
 {
@@ -199,7 +199,7 @@ std::string ShowAll(const List& items)
     return all;
 }
 
-/// The items that a getter fills an array with, which had other content before.
+/// The items that a getter stores in an array, which had other content before.
 template <class Block, class Getter>
 std::string Points(const Block& block, Getter getter)
 {
@@ -207,7 +207,7 @@ std::string Points(const Block& block, Getter getter)
     return (block.*getter)(points) == S_OK ? ShowAll(points) : "failed";
 }
 
-/// A getter of points, where other functions have its name too.
+/// The type of a getter of points, to choose it among functions of the same name.
 using PointsOfCurve = HRESULT (DCMKennlinie::*)(std::vector<CComVariant>&) const;
 
 } // namespace test

@@ -43,7 +43,8 @@ TEST(WindowsCodePages, StartWithThatOfTheThread)
     // A new thread: this one may have chosen a page.
     std::thread([&] {
         SetThreadLocale(MAKELCID(MAKELANGID(LANG_GREEK, SUBLANG_DEFAULT), SORT_DEFAULT));
-        // A letter that only looks like one of the page is lacking, and a surrogate pair once.
+        // A letter that only looks like one of the page becomes ?, and a surrogate pair becomes one
+        // ?.
         bytes = Narrow(L"\u03A9\u0100\u00E4\U0001F600");
     }).join();
     EXPECT_EQ(bytes, "\xD9???");

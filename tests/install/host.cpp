@@ -1,4 +1,4 @@
-// A host as a user of the library writes it: writes a file, reads it, and meets an error.
+// A host as users write it: it writes a file, reads it and handles an error.
 #include "dcm/library/dcm.h"
 
 #include <cstdio>
@@ -25,5 +25,5 @@ int main()
     } catch (const CFileException& e) {
         return e.m_cause == CFileException::fileNotFound ? 0 : 1;
     }
-    return std::puts("a missing file is not missed"), 1;
+    return std::puts("opening a missing file does not fail"), 1;
 }
