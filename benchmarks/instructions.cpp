@@ -6,7 +6,7 @@
 #include "benchmarks/temporary_folder.h"
 #include "dcm/elements/number.h"
 #include "dcm/library/dcm.h"
-#include "dcm/platform/codepage.h"
+#include "dcm/platform/word.h"
 
 #include <valgrind/callgrind.h>
 

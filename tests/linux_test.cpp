@@ -17,6 +17,7 @@
 #include <unistd.h>
 
 using namespace test;
+using namespace std::string_view_literals;
 
 namespace {
 
@@ -156,7 +157,6 @@ TEST(FileFault, OfEachCallIsReported)
         {{"open", 1, EMFILE}, kFailed, kFailed, false},
         {{"fstat", 1, EIO}, kFailed, kFailed, false},
         {{"fstat", 2, EIO}, S_OK, S_OK, false},
-        {{"fstat", 3, EIO}, S_OK, kFailed, false},
         {{"flock", 1, EINTR}, S_OK, S_OK, true},
         {{"flock", 1, ENOLCK}, S_OK, S_OK, true},
         {{"flock", 1, EWOULDBLOCK}, kFailed, kFailed, false},
@@ -184,7 +184,7 @@ TEST(FileFault, OfEachCallIsReported)
         bool met = Under(one, [&] { result = source.Export(path); });
         EXPECT_EQ(result, exported);
         // When the export's own request for the status fails, it writes nothing.
-        EXPECT_TRUE(result != S_OK || ReadBytes(path) == (one.number == 3 ? "" : bytes));
+        EXPECT_TRUE(result != S_OK || ReadBytes(path) == (one.call == "fstat"sv ? "" : bytes));
         EXPECT_TRUE(bytes.starts_with(ReadBytes(path))) << "what was written before stays";
         EXPECT_EQ(ExportBytes(source, path), bytes);
         met = Under(one, [&] { result = document.Import(path); }) || met;

@@ -44,7 +44,7 @@ TEST(TextFile, WritesTextWithCrLf)
     for (const auto text : {L""sv, L"a\nb\r\nc\rd\r\r\n\n\r"sv, L"20\u00B0"sv, L"\n"sv, L"e\0f"sv})
         EXPECT_EQ(file.WriteText(CString(text)), 1);
     file.Close();
-    EXPECT_EQ(ReadBytes(folder / L"out"), "a\r\nb\r\nc\rd\r\r\n\r\n\r20\xB0\r\ne\0f"sv);
+    EXPECT_EQ(ReadBytes(folder / L"out"), "a\r\nb\r\nc\rd\r\r\n\r\n\r20\xB0\r\ne?f");
 }
 
 TEST(TextFile, OpensAnewWithOrWithoutSuccess)

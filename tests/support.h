@@ -1,7 +1,8 @@
 #pragma once
 
 #include "dcm/library/dcm.h"
-#include "dcm/platform/file_text_builder.h"
+#include "dcm/platform/thread_code_page.h"
+#include "dcm/textfile/file_text_builder.h"
 
 #include <charconv>
 #include <filesystem>
@@ -114,7 +115,7 @@ inline std::string Narrow(std::wstring_view text)
 {
     auto builder = dcm::FileTextBuilder::ForFile();
     std::string converted;
-    return std::string(dcm::ToThreadCodePage(builder.Append(text).Bytes(), converted));
+    return std::string(builder.Append(text).BytesOfFile(converted));
 }
 
 /// What a block writes, with single line feeds. An export may change `block`.

@@ -1,9 +1,11 @@
 #include "dcm/converter/dcmconverter.h"
 
 #include "dcm/converter/document_io.h"
+#include "dcm/elements/block_io.h"
 #include "dcm/elements/keywords.h"
-#include "dcm/platform/file_text_builder.h"
 #include "dcm/platform/text.h"
+#include "dcm/textfile/file_text.h"
+#include "dcm/textfile/file_text_builder.h"
 #include "dcm/textfile/pravfile.h"
 
 #include <algorithm>
@@ -13,36 +15,60 @@
 #include <utility>
 
 /// What belongs to one kind of block: how it comes in and how its list goes out.
-struct DCMConverter::BlockKind
+struct dcm::DocumentIo::Kind
 {
     std::wstring_view keyword;
-    HRESULT (DCMConverter::*insert)(const dcm::FileBlock& block);
+    HRESULT (DCMConverter::*insert)(const FileBlock& block);
     HRESULT (DCMConverter::*write)(PravFile& file) const;
 };
 
 /// The kinds in the order in which they are exported.
-const DCMConverter::BlockKind DCMConverter::kBlockKinds[] = {
-    {dcm::keyword::kFestwert, &DCMConverter::InsertFestwert, &DCMConverter::WriteFestwerte},
-    {dcm::keyword::kFestwerteblock, &DCMConverter::InsertFestwerteBlock,
+const dcm::DocumentIo::Kind dcm::DocumentIo::kKinds[] = {
+    {keyword::kFestwert, &DCMConverter::InsertFestwert, &DCMConverter::WriteFestwerte},
+    {keyword::kFestwerteblock, &DCMConverter::InsertFestwerteBlock,
      &DCMConverter::WriteFestwerteblock},
-    {dcm::keyword::kStuetzstellenverteilung, &DCMConverter::InsertStuetzstellenverteilung,
+    {keyword::kStuetzstellenverteilung, &DCMConverter::InsertStuetzstellenverteilung,
      &DCMConverter::WriteStuetzstellenverteilung},
-    {dcm::keyword::kKennlinie, &DCMConverter::InsertKennlinie, &DCMConverter::WriteKennlinie},
-    {dcm::keyword::kFestkennlinie, &DCMConverter::InsertFestKennlinie,
+    {keyword::kKennlinie, &DCMConverter::InsertKennlinie, &DCMConverter::WriteKennlinie},
+    {keyword::kFestkennlinie, &DCMConverter::InsertFestKennlinie,
      &DCMConverter::WriteFestKennlinie},
-    {dcm::keyword::kGruppenkennlinie, &DCMConverter::InsertGruppenKennlinie,
+    {keyword::kGruppenkennlinie, &DCMConverter::InsertGruppenKennlinie,
      &DCMConverter::WriteGruppenKennlinie},
-    {dcm::keyword::kKennfeld, &DCMConverter::InsertKennfeld, &DCMConverter::WriteKennfeld},
-    {dcm::keyword::kFestkennfeld, &DCMConverter::InsertFestKennfeld,
-     &DCMConverter::WriteFestKennfeld},
-    {dcm::keyword::kGruppenkennfeld, &DCMConverter::InsertGruppenKennfeld,
+    {keyword::kKennfeld, &DCMConverter::InsertKennfeld, &DCMConverter::WriteKennfeld},
+    {keyword::kFestkennfeld, &DCMConverter::InsertFestKennfeld, &DCMConverter::WriteFestKennfeld},
+    {keyword::kGruppenkennfeld, &DCMConverter::InsertGruppenKennfeld,
      &DCMConverter::WriteGruppenKennfeld},
-    {dcm::keyword::kTextstring, &DCMConverter::InsertTextstring, &DCMConverter::WriteTextstring},
+    {keyword::kTextstring, &DCMConverter::InsertTextstring, &DCMConverter::WriteTextstring},
 };
 
 namespace {
 
 constexpr std::string_view kCommentMark = "* ";
+
+/// Reads a new block and stores it unless its reader rejects it.
+template <class Block>
+HRESULT Insert(std::list<Block>& blocks, const dcm::FileBlock& block)
+{
+    std::list<Block> fresh(1);
+    const HRESULT result = dcm::BlockIo::Read(block, fresh.front());
+    if (SUCCEEDED(result))
+        blocks.splice(blocks.end(), fresh);
+    return result;
+}
+
+/// Writes each block's text. The stored blocks do not change: only the export of a block that the
+/// host holds empties a unit of one blank.
+template <class Block>
+HRESULT Write(const std::list<Block>& blocks, PravFile& file)
+{
+    auto text = dcm::FileTextBuilder::ForFile();
+    for (const Block& block : blocks) {
+        text.Clear();
+        dcm::BlockIo::Compose(block, text);
+        dcm::WriteText(text, file);
+    }
+    return S_OK;
+}
 
 } // namespace
 
@@ -76,28 +102,30 @@ void dcm::DocumentIo::Import(DCMConverter& document, const CString& path, FileSt
     if (!file.CFile::Open(path, CFile::modeRead, &error))
         throw CFileException(error);
     stage = FileStage::kReading;
-    file.LoadContent(CFile::modeRead);
+    BlockIo::Load(file);
     stage = FileStage::kBlocks;
     document.m_bBlockSeen = 0;
-    while (file.ReadBlock())
-        document.AnalyzeToken(file.Block());
+    FileBlock block;
+    while (BlockIo::Next(file, block))
+        document.AnalyzeToken(block);
 }
 
-/// Takes what is in front of the first blank as the keyword of the block. No keyword goes beyond
-/// the first line.
+/// Takes the text before the first blank as the keyword of the block. No keyword goes beyond the
+/// first line.
 HRESULT DCMConverter::AnalyzeToken(const dcm::FileBlock& block)
 {
     if (block.LineCount() == 0)
         return S_OK;
-    const std::string_view line = block.Line(0).bytes;
+    const std::string_view line = block.Line(0);
     const std::size_t blank = line.find(' ');
     if (blank == line.npos)
         return S_OK;
     const std::string_view keyword = line.substr(0, blank);
-    const auto* const kind =
-        std::find_if(std::begin(kBlockKinds), std::end(kBlockKinds),
-                     [&](const BlockKind& k) { return dcm::EqualsNoCase(keyword, k.keyword); });
-    if (kind != std::end(kBlockKinds)) {
+    const auto& kinds = dcm::DocumentIo::kKinds;
+    const auto* const kind = std::find_if(std::begin(kinds), std::end(kinds), [&](const auto& k) {
+        return dcm::EqualsNoCase(keyword, k.keyword);
+    });
+    if (kind != std::end(kinds)) {
         // A block that its parser rejects is dropped, but it ends the comment like any other.
         (this->*kind->insert)(block);
         m_bBlockSeen = 1;
@@ -115,14 +143,13 @@ HRESULT DCMConverter::InsertKommentar(const dcm::FileBlock& block)
 {
     CString comment;
     for (std::size_t i = 0; i < block.LineCount(); ++i) {
-        const auto [bytes, file] = block.Line(i);
-        std::string_view rest = bytes;
+        std::string_view rest = block.Line(i);
         std::size_t mark = 0;
         while ((mark = rest.find(kCommentMark)) != rest.npos) {
-            dcm::AppendWide(comment, rest.substr(0, mark), file->encoding);
+            block.Text().AppendWide(comment, rest.substr(0, mark));
             rest.remove_prefix(mark + kCommentMark.size());
         }
-        dcm::AppendWide(comment, rest, file->encoding);
+        block.Text().AppendWide(comment, rest);
         comment.Append(L"\n");
     }
     m_strComment = std::move(comment);
@@ -135,65 +162,54 @@ HRESULT DCMConverter::InsertKonservierungsFormat(const dcm::FileBlock&)
     return S_OK;
 }
 
-/// Parses a new block and stores it unless the parser rejects it.
-template <class Block>
-HRESULT DCMConverter::InsertBlock(std::list<Block>& blocks, const dcm::FileBlock& block)
-{
-    std::list<Block> fresh(1);
-    const HRESULT result = fresh.front().ReadBlock(block);
-    if (SUCCEEDED(result))
-        blocks.splice(blocks.end(), fresh);
-    return result;
-}
-
 HRESULT DCMConverter::InsertFestwert(const dcm::FileBlock& block)
 {
-    return InsertBlock(m_listFestwerte, block);
+    return Insert(m_listFestwerte, block);
 }
 
 HRESULT DCMConverter::InsertFestwerteBlock(const dcm::FileBlock& block)
 {
-    return InsertBlock(m_listFestwerteblock, block);
+    return Insert(m_listFestwerteblock, block);
 }
 
 HRESULT DCMConverter::InsertStuetzstellenverteilung(const dcm::FileBlock& block)
 {
-    return InsertBlock(m_listStuetzstellenverteilung, block);
+    return Insert(m_listStuetzstellenverteilung, block);
 }
 
 HRESULT DCMConverter::InsertKennlinie(const dcm::FileBlock& block)
 {
-    return InsertBlock(m_listKennlinie, block);
+    return Insert(m_listKennlinie, block);
 }
 
 HRESULT DCMConverter::InsertFestKennlinie(const dcm::FileBlock& block)
 {
-    return InsertBlock(m_listFestkennlinie, block);
+    return Insert(m_listFestkennlinie, block);
 }
 
 HRESULT DCMConverter::InsertGruppenKennlinie(const dcm::FileBlock& block)
 {
-    return InsertBlock(m_listGruppenkennlinie, block);
+    return Insert(m_listGruppenkennlinie, block);
 }
 
 HRESULT DCMConverter::InsertKennfeld(const dcm::FileBlock& block)
 {
-    return InsertBlock(m_listKennfeld, block);
+    return Insert(m_listKennfeld, block);
 }
 
 HRESULT DCMConverter::InsertFestKennfeld(const dcm::FileBlock& block)
 {
-    return InsertBlock(m_listFestkennfeld, block);
+    return Insert(m_listFestkennfeld, block);
 }
 
 HRESULT DCMConverter::InsertGruppenKennfeld(const dcm::FileBlock& block)
 {
-    return InsertBlock(m_listGruppenkennfeld, block);
+    return Insert(m_listGruppenkennfeld, block);
 }
 
 HRESULT DCMConverter::InsertTextstring(const dcm::FileBlock& block)
 {
-    return InsertBlock(m_listTextstring, block);
+    return Insert(m_listTextstring, block);
 }
 
 HRESULT DCMConverter::AddFestwert(const DCMFestwert& block)
@@ -279,7 +295,7 @@ bool dcm::DocumentIo::Export(const DCMConverter& document, const CString& path, 
     // Every writer returns 0: what fails is thrown.
     document.WriteHeader(file);
     document.WriteFormat(file);
-    for (const DCMConverter::BlockKind& kind : DCMConverter::kBlockKinds)
+    for (const Kind& kind : kKinds)
         (document.*kind.write)(file);
     file.Close();
     return true;
@@ -295,66 +311,52 @@ HRESULT DCMConverter::WriteFormat(PravFile& file) const
     return m_format.Export(file);
 }
 
-/// Writes each block's text. The stored blocks stay as they are: what a block's own export changes
-/// in it, a unit of one blank, belongs to the caller who holds that block.
-template <class Block>
-HRESULT DCMConverter::WriteBlocks(const std::list<Block>& blocks, PravFile& file)
-{
-    auto text = dcm::FileTextBuilder::ForFile();
-    for (const Block& block : blocks) {
-        text.Clear();
-        block.ComposeBlock(text);
-        file.WriteText(text);
-    }
-    return S_OK;
-}
-
 HRESULT DCMConverter::WriteFestwerte(PravFile& file) const
 {
-    return WriteBlocks(m_listFestwerte, file);
+    return Write(m_listFestwerte, file);
 }
 
 HRESULT DCMConverter::WriteFestwerteblock(PravFile& file) const
 {
-    return WriteBlocks(m_listFestwerteblock, file);
+    return Write(m_listFestwerteblock, file);
 }
 
 HRESULT DCMConverter::WriteStuetzstellenverteilung(PravFile& file) const
 {
-    return WriteBlocks(m_listStuetzstellenverteilung, file);
+    return Write(m_listStuetzstellenverteilung, file);
 }
 
 HRESULT DCMConverter::WriteKennlinie(PravFile& file) const
 {
-    return WriteBlocks(m_listKennlinie, file);
+    return Write(m_listKennlinie, file);
 }
 
 HRESULT DCMConverter::WriteFestKennlinie(PravFile& file) const
 {
-    return WriteBlocks(m_listFestkennlinie, file);
+    return Write(m_listFestkennlinie, file);
 }
 
 HRESULT DCMConverter::WriteGruppenKennlinie(PravFile& file) const
 {
-    return WriteBlocks(m_listGruppenkennlinie, file);
+    return Write(m_listGruppenkennlinie, file);
 }
 
 HRESULT DCMConverter::WriteKennfeld(PravFile& file) const
 {
-    return WriteBlocks(m_listKennfeld, file);
+    return Write(m_listKennfeld, file);
 }
 
 HRESULT DCMConverter::WriteFestKennfeld(PravFile& file) const
 {
-    return WriteBlocks(m_listFestkennfeld, file);
+    return Write(m_listFestkennfeld, file);
 }
 
 HRESULT DCMConverter::WriteGruppenKennfeld(PravFile& file) const
 {
-    return WriteBlocks(m_listGruppenkennfeld, file);
+    return Write(m_listGruppenkennfeld, file);
 }
 
 HRESULT DCMConverter::WriteTextstring(PravFile& file) const
 {
-    return WriteBlocks(m_listTextstring, file);
+    return Write(m_listTextstring, file);
 }

@@ -18,6 +18,7 @@ class PravFile;
 
 namespace dcm {
 struct DocumentIo;
+class FileBlock;
 } // namespace dcm
 
 /// The document: the blocks of a DCM file, one list for each kind, with the text at the top of an
@@ -90,9 +91,6 @@ public:
 private:
     friend struct dcm::DocumentIo;
 
-    struct BlockKind;
-    static const BlockKind kBlockKinds[];
-
     HRESULT AnalyzeToken(const dcm::FileBlock& block);
     HRESULT InsertKommentar(const dcm::FileBlock& block);
     HRESULT InsertKonservierungsFormat(const dcm::FileBlock& block);
@@ -119,11 +117,6 @@ private:
     HRESULT WriteFestKennfeld(PravFile& file) const;
     HRESULT WriteGruppenKennfeld(PravFile& file) const;
     HRESULT WriteTextstring(PravFile& file) const;
-
-    template <class Block>
-    static HRESULT InsertBlock(std::list<Block>& blocks, const dcm::FileBlock& block);
-    template <class Block>
-    static HRESULT WriteBlocks(const std::list<Block>& blocks, PravFile& file);
 
     DCMHeader m_header;
     DCMKonservierungsFormat m_format;

@@ -17,8 +17,13 @@ enum class FileStage : unsigned char
     kBlocks,
 };
 
+/// The one friend of the document.
 struct DocumentIo
 {
+    /// The kinds of blocks, in the order in which they are exported.
+    struct Kind;
+    static const Kind kKinds[];
+
     /// What the document's Import does; failures are raised. `stage` tells how far it came.
     /// Nothing is reported when `findings` is null.
     static void Import(DCMConverter& document, const CString& path, FileStage& stage,

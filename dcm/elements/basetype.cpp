@@ -1,8 +1,32 @@
 #include "dcm/elements/basetype.h"
 
-#include "dcm/elements/block_text.h"
+#include "dcm/elements/block_io.h"
+#include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/platform/text.h"
+#include "dcm/textfile/file_text.h"
+#include "dcm/textfile/file_text_builder.h"
+
+namespace {
+
+void AppendLangname(dcm::FileTextBuilder& block, const CString& text)
+{
+    dcm::AppendQuotedLine(block, dcm::keyword::kLangname, text);
+}
+
+void AppendDisplayname(dcm::FileTextBuilder& block, const CString& text)
+{
+    if (!text.IsEmpty())
+        dcm::AppendQuotedLine(block, dcm::keyword::kDisplayname, text);
+}
+
+void AppendFunktion(dcm::FileTextBuilder& block, const CString& text)
+{
+    if (!text.IsEmpty())
+        dcm::AppendLine(block, dcm::keyword::kFunktion, text);
+}
+
+} // namespace
 
 DCMBaseType::DCMBaseType() = default;
 
@@ -11,58 +35,42 @@ DCMBaseType::~DCMBaseType() = default;
 CString DCMBaseType::ExportLangname(PravFile&) const
 {
     auto line = dcm::FileTextBuilder::ForHost();
-    AppendLangname(line);
+    AppendLangname(line, m_strLangname);
     return line.Wide();
 }
 
 CString DCMBaseType::ExportDisplayname(PravFile&) const
 {
     auto line = dcm::FileTextBuilder::ForHost();
-    AppendDisplayname(line);
+    AppendDisplayname(line, m_strDisplayname);
     return line.Wide();
 }
 
 CString DCMBaseType::ExportFunktion(PravFile&) const
 {
     auto line = dcm::FileTextBuilder::ForHost();
-    AppendFunktion(line);
+    AppendFunktion(line, m_strFunction);
     return line.Wide();
 }
 
-void DCMBaseType::AppendAttributes(dcm::FileTextBuilder& block) const
+bool dcm::BlockIo::ReadAttribute(std::string_view keyword, std::string_view value,
+                                 std::string_view function, const FileText& text,
+                                 DCMBaseType& block)
 {
-    AppendLangname(block);
-    AppendDisplayname(block);
-    AppendFunktion(block);
-}
-
-bool DCMBaseType::ReadAttribute(std::string_view keyword, dcm::FileTextView value,
-                                dcm::FileTextView function)
-{
-    if (dcm::EqualsNoCase(keyword, dcm::keyword::kLangname))
-        m_strLangname = value.SharedWide();
-    else if (dcm::EqualsNoCase(keyword, dcm::keyword::kDisplayname))
-        m_strDisplayname = value.SharedWide();
-    else if (dcm::EqualsNoCase(keyword, dcm::keyword::kFunktion))
-        m_strFunction = function.SharedWide();
+    if (EqualsNoCase(keyword, keyword::kLangname))
+        block.m_strLangname = text.SharedWide(value);
+    else if (EqualsNoCase(keyword, keyword::kDisplayname))
+        block.m_strDisplayname = text.SharedWide(value);
+    else if (EqualsNoCase(keyword, keyword::kFunktion))
+        block.m_strFunction = text.SharedWide(function);
     else
         return false;
     return true;
 }
 
-void DCMBaseType::AppendLangname(dcm::FileTextBuilder& block) const
+void dcm::BlockIo::ComposeAttributes(const DCMBaseType& block, FileTextBuilder& text)
 {
-    dcm::AppendQuotedLine(block, dcm::keyword::kLangname, m_strLangname);
-}
-
-void DCMBaseType::AppendDisplayname(dcm::FileTextBuilder& block) const
-{
-    if (!m_strDisplayname.IsEmpty())
-        dcm::AppendQuotedLine(block, dcm::keyword::kDisplayname, m_strDisplayname);
-}
-
-void DCMBaseType::AppendFunktion(dcm::FileTextBuilder& block) const
-{
-    if (!m_strFunction.IsEmpty())
-        dcm::AppendLine(block, dcm::keyword::kFunktion, m_strFunction);
+    AppendLangname(text, block.m_strLangname);
+    AppendDisplayname(text, block.m_strDisplayname);
+    AppendFunktion(text, block.m_strFunction);
 }

@@ -1,12 +1,13 @@
 #pragma once
 
 #include "dcm/library/export.h"
-#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 
-#include <string_view>
-
 class PravFile;
+
+namespace dcm {
+struct BlockIo;
+} // namespace dcm
 
 /// What every named block has: its name and three describing texts. Any text may be stored; it is
 /// written as it is, so a line feed or double quote in it does not come back from a file.
@@ -49,18 +50,8 @@ protected:
     CString ExportDisplayname(PravFile& file) const;
     CString ExportFunktion(PravFile& file) const;
 
-    /// Appends the three lines to a block.
-    void AppendAttributes(dcm::FileTextBuilder& block) const;
-
-    /// Stores `value` when `keyword` is that of LANGNAME or DISPLAYNAME, `function` when it is
-    /// that of FUNKTION; otherwise returns false.
-    bool ReadAttribute(std::string_view keyword, dcm::FileTextView value,
-                       dcm::FileTextView function);
-
 private:
-    void AppendLangname(dcm::FileTextBuilder& block) const;
-    void AppendDisplayname(dcm::FileTextBuilder& block) const;
-    void AppendFunktion(dcm::FileTextBuilder& block) const;
+    friend struct dcm::BlockIo;
 
     CString m_strName;
     CString m_strLangname;

@@ -1,19 +1,22 @@
 #include "dcm/elements/festwert.h"
 
-#include "dcm/elements/block_lines.h"
-#include "dcm/elements/block_text.h"
+#include "dcm/elements/block_io.h"
+#include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
 #include "dcm/elements/variant_number.h"
 #include "dcm/platform/text.h"
+#include "dcm/textfile/file_text.h"
+#include "dcm/textfile/file_text_builder.h"
 #include "dcm/textfile/pravfile.h"
 
 #include <string_view>
 
 namespace {
 
-/// A text on its own line has nothing behind its closing quote.
-constexpr dcm::TextItemStyle kSingleText = {L"\n\r", L""};
+/// A text on a line of its own has nothing after its closing quote.
+constexpr dcm::TextItemStyle kSingleText = {L"\n\r", ""};
 
 void AppendValueLine(dcm::FileTextBuilder& block, const VARIANT& value)
 {
@@ -29,6 +32,27 @@ void AppendValueLine(dcm::FileTextBuilder& block, const VARIANT& value)
     block.EndLine();
 }
 
+/// Stores the text of a TEXT line. The words "true" and "false", in these letters only, are
+/// numbers.
+void ReadValueText(std::string_view part, const dcm::FileText& text, CComVariant& value)
+{
+    if (part == "true") {
+        value = 1.0;
+    } else if (part == "false") {
+        value = 0.0;
+    } else {
+        try {
+            value.SetText(text.Wide(dcm::TrimQuotes(dcm::TrimWhite(part))));
+        } catch (...) {
+            // The wide text or the value's copy of it: whichever has no memory, the value says so.
+            VariantClear(&value);
+            value.vt = VT_ERROR;
+            value.scode = E_OUTOFMEMORY;
+            throw;
+        }
+    }
+}
+
 } // namespace
 
 DCMFestwert::DCMFestwert() : m_strKeyword(dcm::keyword::kFestwert)
@@ -38,70 +62,47 @@ DCMFestwert::~DCMFestwert() = default;
 
 HRESULT DCMFestwert::Init(const CString& strBlock)
 {
-    return ReadBlock(dcm::HostBlock(strBlock).Block());
+    return dcm::BlockIo::Read(dcm::HostBlock(strBlock).Block(), *this);
 }
 
-HRESULT DCMFestwert::ReadBlock(const dcm::FileBlock& block)
+HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwert& block)
 {
-    dcm::BlockLines lines(block);
-    dcm::BlockLine line;
-    while (lines.Next(line)) {
-        const dcm::FileTextView text = dcm::TrimQuotes(dcm::TrimWhite(line.rest));
-        const dcm::FileTextView rest = dcm::TrimBlanks(text);
-        if (line.Is(m_strKeyword))
-            SetName(rest.Wide());
-        else if (ReadAttribute(line.keyword, rest, rest))
+    const FileText& text = lines.Text();
+    BlockReader reader(lines);
+    BlockLine line;
+    while (reader.Next(line)) {
+        const std::string_view value = TrimQuotes(TrimWhite(line.rest));
+        const std::string_view rest = TrimBlanks(value);
+        if (line.Is(block.m_strKeyword))
+            block.SetName(text.Wide(rest));
+        else if (ReadAttribute(line.keyword, rest, rest, text, block))
             continue;
-        else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnit = rest.SharedWide();
-        else if (line.Is(dcm::keyword::kWert))
-            m_value = dcm::ReadNumber(rest.bytes);
-        else if (line.Is(dcm::keyword::kText))
-            ReadText(text);
+        else if (line.Is(keyword::kEinheitW))
+            block.m_strUnit = text.SharedWide(rest);
+        else if (line.Is(keyword::kWert))
+            block.m_value = ReadNumber(rest);
+        else if (line.Is(keyword::kText))
+            ReadValueText(value, text, block.m_value);
     }
     return S_OK;
-}
-
-/// Truth words are numbers; in these letters only.
-void DCMFestwert::ReadText(dcm::FileTextView text)
-{
-    if (text.bytes == "true")
-        m_value = 1.0;
-    else if (text.bytes == "false")
-        m_value = 0.0;
-    else
-        SetText(dcm::TrimQuotes(dcm::TrimWhite(text)));
-}
-
-/// Whichever memory is missing, the value says so.
-void DCMFestwert::SetText(dcm::FileTextView text)
-{
-    try {
-        m_value.SetText(text.Wide());
-    } catch (...) {
-        VariantClear(&m_value);
-        m_value.vt = VT_ERROR;
-        m_value.scode = E_OUTOFMEMORY;
-        throw;
-    }
 }
 
 HRESULT DCMFestwert::Export(PravFile& file)
 {
     auto block = dcm::FileTextBuilder::ForFile();
-    ComposeBlock(block);
+    dcm::BlockIo::Compose(*this, block);
     dcm::DropBlankUnit(m_strUnit);
-    file.WriteText(block);
+    dcm::WriteText(block, file);
     return S_OK;
 }
 
-void DCMFestwert::ComposeBlock(dcm::FileTextBuilder& block) const
+void dcm::BlockIo::Compose(const DCMFestwert& block, FileTextBuilder& text)
 {
-    block.Append(m_strKeyword).Append(L" ").Append(GetName()).EndLine();
-    AppendAttributes(block);
-    dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnit);
-    AppendValueLine(block, m_value);
-    dcm::AppendEnd(block);
+    text.Append(block.m_strKeyword).AppendAscii(" ").Append(block.GetName()).EndLine();
+    ComposeAttributes(block, text);
+    AppendUnitLine(text, keyword::kEinheitW, block.m_strUnit);
+    AppendValueLine(text, block.m_value);
+    AppendEnd(text);
 }
 
 HRESULT DCMFestwert::GetValue(VARIANT* pValue) const

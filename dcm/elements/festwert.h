@@ -3,12 +3,8 @@
 #include "dcm/elements/basetype.h"
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
-#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
-#include "dcm/textfile/fileblock.h"
-
-#include <string_view>
 
 /// One FESTWERT: a named single value, a number or a text, with its unit.
 class DCM_API DCMFestwert : public DCMBaseType
@@ -60,13 +56,7 @@ protected:
     CString m_strKeyword;
 
 private:
-    friend class DCMConverter;
-    void ReadText(dcm::FileTextView text);
-    void SetText(dcm::FileTextView text);
-    /// Init for the text of a file.
-    HRESULT ReadBlock(const dcm::FileBlock& block);
-    /// Composes the block in `block`, which is empty before.
-    void ComposeBlock(dcm::FileTextBuilder& block) const;
+    friend struct dcm::BlockIo;
 
     CString m_strUnit;
     CComVariant m_value;

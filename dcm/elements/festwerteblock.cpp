@@ -1,29 +1,35 @@
 #include "dcm/elements/festwerteblock.h"
 
-#include "dcm/elements/block_lines.h"
-#include "dcm/elements/block_text.h"
+#include "dcm/elements/block_io.h"
+#include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
 #include "dcm/platform/exception.h"
 #include "dcm/platform/text.h"
+#include "dcm/textfile/file_text.h"
+#include "dcm/textfile/file_text_builder.h"
 #include "dcm/textfile/pravfile.h"
 
 #include <algorithm>
 #include <array>
+#include <cstddef>
 #include <string>
+#include <string_view>
 #include <utility>
 
 namespace {
 
-constexpr dcm::TextItemStyle kBlockText = {L"\n\r", L"   "};
+constexpr dcm::TextItemStyle kBlockText = {L"\n\r", "   "};
 
 bool IsQuoted(std::string_view text)
 {
     return text.starts_with('"') && text.ends_with('"');
 }
 
-/// Where the quote that ends the text at the start of `rest` stands: one with a blank or nothing
-/// behind it, that neither begins the text nor follows a backslash. Any other belongs to the text.
+/// The position of the quote that ends the text at the start of `rest`: one that a blank or nothing
+/// follows, and that neither begins the text nor follows a backslash. Any other is part of the
+/// text.
 std::size_t FindClosingQuote(std::string_view rest)
 {
     std::size_t at = rest.find('"');
@@ -45,6 +51,79 @@ bool AnotherTextFollows(std::string_view rest)
            rest[next + 1] != ' ';
 }
 
+void ReadNumbers(std::string_view rest, std::vector<double>& numbers)
+{
+    if (rest.empty())
+        dcm::ThrowResult(E_INVALIDARG);
+    dcm::NumberReader reader(rest);
+    std::array<double, dcm::kNumbersAtOnce> values;
+    std::size_t count = values.size();
+    while (count == values.size()) {
+        count = reader.Next(values);
+        numbers.insert(numbers.end(), values.begin(), values.begin() + count);
+    }
+}
+
+/// Reads a list of quoted texts.
+void ReadTexts(std::string_view rest, const dcm::FileText& text, std::list<CString>& texts)
+{
+    while (!rest.empty()) {
+        const std::size_t quotes = std::min(rest.find_first_not_of('"'), rest.size());
+        rest.remove_prefix(quotes);
+        if (rest.empty())
+            break;
+        if (quotes > 1 && AnotherTextFollows(rest)) {
+            texts.emplace_back();
+        } else {
+            const std::size_t end = FindClosingQuote(rest);
+            if (end == rest.npos) {
+                // No quote closes the text: it runs to the end, without a final quote.
+                texts.push_back(text.Wide(rest.substr(0, rest.size() - rest.ends_with('"'))));
+                break;
+            }
+            texts.push_back(text.Wide(rest.substr(0, end)));
+            rest.remove_prefix(end + 1);
+        }
+        rest.remove_prefix(std::min(rest.find_first_not_of(' '), rest.size()));
+    }
+}
+
+/// Reads the texts of a line. Without quotes around all of it, the whole line is one text.
+void ReadTextLine(std::string_view rest, const dcm::FileText& text, std::list<CString>& texts)
+{
+    if (IsQuoted(rest))
+        return ReadTexts(rest, text, texts);
+    const std::string quoted = '"' + std::string(rest) + '"';
+    ReadTexts(quoted, text, texts);
+}
+
+/// Reads "X @ Y". The count of a list is not needed.
+void ReadCounts(std::string_view counts, const dcm::FileText& text, std::int32_t& x,
+                std::int32_t& y)
+{
+    const std::size_t at = counts.find('@');
+    if (at == counts.npos || at == 0)
+        return;
+    // One character, a blank as a rule, is on either side of the "@".
+    x = dcm::ReadInteger(counts.substr(0, at - 1));
+    const std::string_view rest = counts.substr(at + 1);
+    y = rest.empty() ? 0 : dcm::ReadInteger(text.WithoutFirstCharacter(rest));
+}
+
+/// Appends the lines of values: the numbers, or the texts where there are none.
+void AppendItems(dcm::FileTextBuilder& block, const std::vector<double>& numbers,
+                 const std::list<CString>& texts, int itemsPerLine, int digits)
+{
+    dcm::ItemLines lines(block, itemsPerLine);
+    for (const double number : numbers)
+        lines.AddNumber(dcm::keyword::kWert, number, digits);
+    if (numbers.empty()) {
+        for (const CString& text : texts)
+            lines.AddText(dcm::keyword::kText, text, kBlockText);
+    }
+    lines.EndLine();
+}
+
 } // namespace
 
 DCMFestwerteblock::DCMFestwerteblock() = default;
@@ -59,150 +138,102 @@ DCMFestwerteblock::~DCMFestwerteblock() = default;
 
 HRESULT DCMFestwerteblock::Init(const CString& strBlock)
 {
-    return ReadBlock(dcm::HostBlock(strBlock).Block());
+    return dcm::BlockIo::Read(dcm::HostBlock(strBlock).Block(), *this);
 }
 
-HRESULT DCMFestwerteblock::ReadBlock(const dcm::FileBlock& block)
+HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwerteblock& block)
 {
-    dcm::BlockLines lines(block);
-    dcm::BlockLine line;
-    while (lines.Next(line)) {
+    const FileText& text = lines.Text();
+    BlockReader reader(lines);
+    BlockLine line;
+    while (reader.Next(line)) {
         // White space first, then blanks and quotes, for every line of the block.
-        const dcm::FileTextView rest = dcm::TrimBlanksAndQuotes(dcm::TrimWhite(line.rest));
-        if (line.Is(dcm::keyword::kFestwerteblock))
-            ReadFirstLine(rest);
-        else if (ReadAttribute(line.keyword, rest, rest))
+        const std::string_view rest = TrimBlanksAndQuotes(TrimWhite(line.rest));
+        if (line.Is(keyword::kFestwerteblock)) {
+            std::string_view counts = rest;
+            block.SetName(text.Wide(TakeWord(counts)));
+            ReadCounts(counts, text, block.m_nXValueCount, block.m_nYValueCount);
+        } else if (ReadAttribute(line.keyword, rest, rest, text, block)) {
             continue;
-        else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnit = rest.SharedWide();
-        else if (line.Is(dcm::keyword::kWert))
-            AddValues(rest);
-        else if (line.Is(dcm::keyword::kText))
-            AddTexts(rest);
-    }
-    return S_OK;
-}
-
-/// The name and, for rows, "X @ Y" behind it. The count of a list is not needed.
-void DCMFestwerteblock::ReadFirstLine(dcm::FileTextView rest)
-{
-    SetName(dcm::TakeName(rest).Wide());
-    const std::string_view counts = rest.bytes;
-    const std::size_t at = counts.find('@');
-    if (at == counts.npos || at == 0)
-        return;
-    // A blank, or another character, stands on either side of the "@".
-    m_nXValueCount = dcm::ReadInteger(counts.substr(0, at - 1));
-    rest.bytes = counts.substr(at + 1);
-    if (!rest.bytes.empty())
-        rest.DropFirst();
-    m_nYValueCount = dcm::ReadInteger(rest.bytes);
-}
-
-HRESULT DCMFestwerteblock::AddValues(dcm::FileTextView rest)
-{
-    if (rest.bytes.empty())
-        dcm::ThrowResult(E_INVALIDARG);
-    dcm::NumberReader numbers(rest.bytes);
-    std::array<double, dcm::kNumbersAtOnce> values;
-    std::size_t count = values.size();
-    while (count == values.size()) {
-        count = numbers.Next(values);
-        m_vecDoubleValues.insert(m_vecDoubleValues.end(), values.begin(), values.begin() + count);
-    }
-    return S_OK;
-}
-
-/// A line of texts. Without quotes around all of it, the whole line is one text.
-HRESULT DCMFestwerteblock::AddTexts(dcm::FileTextView rest)
-{
-    rest = dcm::TrimWhite(rest);
-    if (IsQuoted(rest.bytes))
-        return AddStringValues(rest);
-    const std::string quoted = '"' + std::string(rest.bytes) + '"';
-    return AddStringValues({quoted, rest.file});
-}
-
-HRESULT DCMFestwerteblock::AddStringValues(dcm::FileTextView line)
-{
-    std::string_view rest = line.bytes;
-    const auto add = [&](std::string_view text) {
-        m_listStringValues.push_back(dcm::FileTextView{text, line.file}.Wide());
-    };
-    while (!rest.empty()) {
-        const std::size_t quotes = std::min(rest.find_first_not_of('"'), rest.size());
-        rest.remove_prefix(quotes);
-        if (rest.empty())
-            break;
-        if (quotes > 1 && AnotherTextFollows(rest)) {
-            add({});
-        } else {
-            const std::size_t end = FindClosingQuote(rest);
-            if (end == rest.npos) {
-                // Nothing closes the text: it runs to the end, but for a final quote.
-                add(rest.substr(0, rest.size() - (rest.ends_with('"') ? 1 : 0)));
-                break;
-            }
-            add(rest.substr(0, end));
-            rest.remove_prefix(end + 1);
+        } else if (line.Is(keyword::kEinheitW)) {
+            block.m_strUnit = text.SharedWide(rest);
+        } else if (line.Is(keyword::kWert)) {
+            ReadNumbers(rest, block.m_vecDoubleValues);
+        } else if (line.Is(keyword::kText)) {
+            ReadTextLine(TrimWhite(rest), text, block.m_listStringValues);
         }
-        rest.remove_prefix(std::min(rest.find_first_not_of(' '), rest.size()));
     }
+    return S_OK;
+}
+
+HRESULT DCMFestwerteblock::AddValues(CString& strRest)
+{
+    const auto text = dcm::FileText::OfHost(strRest);
+    if (IsQuoted(text.Bytes()))
+        ReadTexts(text.Bytes(), text, m_listStringValues);
+    else
+        ReadNumbers(text.Bytes(), m_vecDoubleValues);
+    strRest.Empty();
+    return S_OK;
+}
+
+HRESULT DCMFestwerteblock::AddStringValues(CString& strRest)
+{
+    const auto text = dcm::FileText::OfHost(strRest);
+    if (text.Bytes().starts_with('"'))
+        ReadTexts(text.Bytes(), text, m_listStringValues);
+    strRest.Empty();
     return S_OK;
 }
 
 HRESULT DCMFestwerteblock::Export(PravFile& file)
 {
     auto block = dcm::FileTextBuilder::ForFile();
-    ComposeBlock(block);
+    dcm::BlockIo::Compose(*this, block);
     dcm::DropBlankUnit(m_strUnit);
-    file.WriteText(block);
+    dcm::WriteText(block, file);
     return S_OK;
 }
 
-void DCMFestwerteblock::ComposeBlock(dcm::FileTextBuilder& block) const
+void dcm::BlockIo::Compose(const DCMFestwerteblock& block, FileTextBuilder& text)
 {
-    block.Append(dcm::keyword::kFestwerteblock).Append(L" ").Append(GetName());
-    if (m_nYValueCount == 0) {
-        const bool numbers = !m_vecDoubleValues.empty();
-        dcm::AppendCount(block, numbers ? m_vecDoubleValues.size() : m_listStringValues.size());
+    text.Append(keyword::kFestwerteblock).AppendAscii(" ").Append(block.GetName());
+    if (block.m_nYValueCount == 0) {
+        const bool numbers = !block.m_vecDoubleValues.empty();
+        AppendCount(text,
+                    numbers ? block.m_vecDoubleValues.size() : block.m_listStringValues.size());
     } else {
-        dcm::AppendCount(block, m_nXValueCount);
-        block.Append(L" @");
-        dcm::AppendCount(block, m_nYValueCount);
+        AppendCount(text, block.m_nXValueCount);
+        text.AppendAscii(" @");
+        AppendCount(text, block.m_nYValueCount);
     }
-    block.EndLine();
-    AppendAttributes(block);
-    dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnit);
-    ExportValues(block);
-    dcm::AppendEnd(block);
+    text.EndLine();
+    ComposeAttributes(block, text);
+    AppendUnitLine(text, keyword::kEinheitW, block.m_strUnit);
+    if (block.m_nXValueCount > 0 && block.m_nYValueCount > 0)
+        AppendItems(text, block.m_vecDoubleValues, block.m_listStringValues, block.m_nXValueCount,
+                    kShortDigits);
+    else
+        AppendItems(text, block.m_vecDoubleValues, block.m_listStringValues, kItemsPerLine,
+                    kFullDigits);
+    AppendEnd(text);
 }
 
-void DCMFestwerteblock::ExportValues(dcm::FileTextBuilder& block) const
+CString DCMFestwerteblock::ExportValues(PravFile&) const
 {
     if (m_nXValueCount > 0 && m_nYValueCount > 0)
-        ExportValues2D(block);
-    else
-        AppendItems(block, dcm::kItemsPerLine, dcm::kFullDigits);
+        return ExportValues2D();
+    auto lines = dcm::FileTextBuilder::ForHost();
+    AppendItems(lines, m_vecDoubleValues, m_listStringValues, dcm::kItemsPerLine, dcm::kFullDigits);
+    return lines.Wide();
 }
 
 /// A row a line, whatever the number of rows.
-void DCMFestwerteblock::ExportValues2D(dcm::FileTextBuilder& block) const
+CString DCMFestwerteblock::ExportValues2D() const
 {
-    AppendItems(block, m_nXValueCount, dcm::kShortDigits);
-}
-
-void DCMFestwerteblock::AppendItems(dcm::FileTextBuilder& block, int itemsPerLine, int digits) const
-{
-    dcm::ItemLines lines(block, itemsPerLine);
-    if (!m_vecDoubleValues.empty()) {
-        for (const double number : m_vecDoubleValues)
-            lines.AddNumber(dcm::keyword::kWert, number, digits);
-    } else {
-        for (const CString& text : m_listStringValues)
-            lines.AddText(dcm::keyword::kText, text, kBlockText);
-    }
-    lines.EndLine();
+    auto lines = dcm::FileTextBuilder::ForHost();
+    AppendItems(lines, m_vecDoubleValues, m_listStringValues, m_nXValueCount, dcm::kShortDigits);
+    return lines.Wide();
 }
 
 void DCMFestwerteblock::AddValue(double dValue)

@@ -3,13 +3,10 @@
 #include "dcm/elements/basetype.h"
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
-#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
-#include "dcm/textfile/fileblock.h"
 
 #include <cstdint>
 #include <list>
-#include <string_view>
 #include <vector>
 
 /// One FESTWERTEBLOCK: a named list of values, or rows of equal length, with one unit. It holds
@@ -67,18 +64,17 @@ public:
     void SetYValueCount(std::int32_t nCount) { m_nYValueCount = nCount; }
 
 private:
-    friend class DCMConverter;
-    void ReadFirstLine(dcm::FileTextView rest);
-    HRESULT AddValues(dcm::FileTextView rest);
-    HRESULT AddTexts(dcm::FileTextView rest);
-    HRESULT AddStringValues(dcm::FileTextView line);
-    /// Init for the text of a file.
-    HRESULT ReadBlock(const dcm::FileBlock& block);
-    /// Composes the block in `block`, which is empty before.
-    void ComposeBlock(dcm::FileTextBuilder& block) const;
-    void ExportValues(dcm::FileTextBuilder& block) const;
-    void ExportValues2D(dcm::FileTextBuilder& block) const;
-    void AppendItems(dcm::FileTextBuilder& block, int itemsPerLine, int digits) const;
+    friend struct dcm::BlockIo;
+
+    /// Reads the numbers or quoted texts of one line and appends them. `strRest` is empty
+    /// afterwards. Returns 0; an empty text raises `E_INVALIDARG`.
+    HRESULT AddValues(CString& strRest);
+    /// The same for a text that begins with a double quote; any other has no values.
+    HRESULT AddStringValues(CString& strRest);
+    /// The lines of values. The file is not written to.
+    CString ExportValues(PravFile& file) const;
+    /// The lines of values, one row a line.
+    CString ExportValues2D() const;
 
     CString m_strUnit;
     /// Lists in the interface; an array here, since a list takes four times the memory.

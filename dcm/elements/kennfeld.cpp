@@ -1,16 +1,49 @@
 #include "dcm/elements/kennfeld.h"
 
-#include "dcm/elements/block_lines.h"
-#include "dcm/elements/block_text.h"
+#include "dcm/elements/block_io.h"
+#include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
 #include "dcm/elements/points.h"
 #include "dcm/platform/text.h"
+#include "dcm/textfile/file_text.h"
+#include "dcm/textfile/file_text_builder.h"
 #include "dcm/textfile/pravfile.h"
 
-#include <algorithm>
+#include <array>
+#include <cstddef>
 #include <span>
+#include <string_view>
 #include <utility>
+
+namespace {
+
+std::array<dcm::PointTarget, 3>
+TargetsOf(const dcm::PointArray& axisX, const dcm::PointArray& axisY, const dcm::PointArray& values)
+{
+    return {{{dcm::kValues, values}, {dcm::kAxisX, axisX}, {dcm::kAxisY, axisY}}};
+}
+
+/// Appends the X axis, then each Y axis point with its row; nothing when there are too few values.
+void AppendPointLines(dcm::FileTextBuilder& block, const std::vector<CComVariant>& axisX,
+                      const std::vector<CComVariant>& axisY, const std::vector<CComVariant>& values)
+{
+    const std::size_t width = axisX.size();
+    if (width * axisY.size() > values.size())
+        return;
+    dcm::PointLines(block, dcm::kAxisX).AddGroup(axisX);
+    dcm::PointLines pointLines(block, dcm::kAxisY);
+    dcm::PointLines rowLines(block, dcm::kValues);
+    std::span<const CComVariant> left(values);
+    for (const CComVariant& point : axisY) {
+        pointLines.AddGroup({&point, 1});
+        rowLines.AddGroup(left.first(width));
+        left = left.subspan(width);
+    }
+}
+
+} // namespace
 
 DCMKennfeld::DCMKennfeld() : m_strKeyword(dcm::keyword::kKennfeld)
 {}
@@ -25,125 +58,106 @@ DCMKennfeld::~DCMKennfeld() = default;
 
 HRESULT DCMKennfeld::Init(const CString& strBlock)
 {
-    return ReadBlock(dcm::HostBlock(strBlock).Block());
+    return dcm::BlockIo::Read(dcm::HostBlock(strBlock).Block(), *this);
 }
 
-HRESULT DCMKennfeld::ReadBlock(const dcm::FileBlock& block)
+HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMKennfeld& block)
 {
-    const auto targets = PointTargets();
-    dcm::PointReader points(targets);
-    dcm::BlockLines lines(block);
-    dcm::BlockLine line;
-    while (lines.Next(line)) {
+    const auto targets =
+        TargetsOf({block.m_vecAxisX, block.m_vtAxisXType}, {block.m_vecAxisY, block.m_vtAxisYType},
+                  {block.m_vecValues, block.m_vtValueType});
+    const FileText& text = lines.Text();
+    PointReader points(targets, text);
+    BlockReader reader(lines);
+    BlockLine line;
+    while (reader.Next(line)) {
         // Most lines of a file are lines of points.
         if (points.Read(line))
             continue;
-        if (line.Is(m_strKeyword))
-            ReadFirstLine(dcm::TrimWhite(line.rest), block);
-        else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
+        if (line.Is(block.m_strKeyword)) {
+            // The name and two counts. Where a word is missing, it is the first one.
+            std::string_view rest = TrimWhite(line.rest);
+            block.SetName(text.Wide(TakeWord(rest)));
+            block.m_nAxisLengthX = ReadInteger(TakeWord(rest));
+            block.m_nAxisLengthY = ReadInteger(rest);
+            const std::int64_t values = std::int64_t{block.m_nAxisLengthX} * block.m_nAxisLengthY;
+            ReservePoints({{block.m_vecAxisX, block.m_nAxisLengthX},
+                           {block.m_vecAxisY, block.m_nAxisLengthY},
+                           {block.m_vecValues, values}},
+                          lines);
+        } else if (ReadAttribute(line.keyword, TrimBlanksAndQuotes(line.rest), line.rest, text,
+                                 block)) {
             continue;
-        else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnitX = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
-        else if (line.Is(dcm::keyword::kEinheitY))
-            m_strUnitY = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
-        else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnitW = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
-        else if (line.Is(dcm::keyword::kSstX))
-            m_strStuetzstellenverteilungX = dcm::TrimBlanks(line.rest).SharedWide();
-        else if (line.Is(dcm::keyword::kSstY))
-            m_strStuetzstellenverteilungY = dcm::TrimBlanks(line.rest).SharedWide();
+        } else if (line.Is(keyword::kEinheitX)) {
+            block.m_strUnitX = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+        } else if (line.Is(keyword::kEinheitY)) {
+            block.m_strUnitY = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+        } else if (line.Is(keyword::kEinheitW)) {
+            block.m_strUnitW = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+        } else if (line.Is(keyword::kSstX)) {
+            block.m_strStuetzstellenverteilungX = text.SharedWide(TrimBlanks(line.rest));
+        } else if (line.Is(keyword::kSstY)) {
+            block.m_strStuetzstellenverteilungY = text.SharedWide(TrimBlanks(line.rest));
+        }
     }
     return S_OK;
 }
 
-/// The name, the count of the X axis and that of the Y axis. Where a word is missing, it is the
-/// one in front.
-void DCMKennfeld::ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block)
+HRESULT DCMKennfeld::AddValues(const CString& strRest, const CString& strKeyword)
 {
-    SetName(dcm::TakeName(rest).Wide());
-    m_nAxisLengthX = dcm::ReadInteger(dcm::TakeName(rest).bytes);
-    m_nAxisLengthY = dcm::ReadInteger(rest.bytes);
-    const std::int64_t values = std::int64_t{m_nAxisLengthX} * m_nAxisLengthY;
-    dcm::ReservePoints(
-        {{m_vecAxisX, m_nAxisLengthX}, {m_vecAxisY, m_nAxisLengthY}, {m_vecValues, values}}, block);
-}
-
-HRESULT DCMKennfeld::AddValues(std::wstring_view rest, std::wstring_view keyword)
-{
-    const dcm::FileText word = dcm::FileTextOfHost(keyword);
-    const dcm::FileText text = dcm::FileTextOfHost(rest);
-    const auto targets = PointTargets();
-    dcm::PointReader(targets).Read({word.Bytes(), text.View()});
+    const auto targets = TargetsOf({m_vecAxisX, m_vtAxisXType}, {m_vecAxisY, m_vtAxisYType},
+                                   {m_vecValues, m_vtValueType});
+    const auto keyword = dcm::FileText::OfHost(strKeyword);
+    const auto text = dcm::FileText::OfHost(strRest);
+    dcm::PointReader(targets, text).Read({keyword.Bytes(), text.Bytes()});
     return S_OK;
-}
-
-std::array<dcm::PointTarget, 3> DCMKennfeld::PointTargets()
-{
-    return {{{dcm::kValues, {m_vecValues, m_vtValueType}},
-             {dcm::kAxisX, {m_vecAxisX, m_vtAxisXType}},
-             {dcm::kAxisY, {m_vecAxisY, m_vtAxisYType}}}};
 }
 
 HRESULT DCMKennfeld::Export(PravFile& file)
 {
     auto block = dcm::FileTextBuilder::ForFile();
-    ComposeBlock(block);
+    dcm::BlockIo::Compose(*this, block);
     dcm::DropBlankUnit(m_strUnitX);
     dcm::DropBlankUnit(m_strUnitY);
     dcm::DropBlankUnit(m_strUnitW);
-    file.WriteText(block);
+    dcm::WriteText(block, file);
     return S_OK;
 }
 
-void DCMKennfeld::ComposeBlock(dcm::FileTextBuilder& block) const
+void dcm::BlockIo::Compose(const DCMKennfeld& block, FileTextBuilder& text)
 {
-    block.Append(m_strKeyword).Append(L" ").Append(GetName());
+    const std::size_t start = text.Size();
+    text.Append(block.m_strKeyword).AppendAscii(" ").Append(block.GetName());
     const auto appendCount = [&](std::int32_t axisLength, std::size_t points) {
         if (axisLength > 0)
-            dcm::AppendCount(block, axisLength);
+            AppendCount(text, axisLength);
         else
-            dcm::AppendCount(block, points);
+            AppendCount(text, points);
     };
-    appendCount(m_nAxisLengthX, m_vecAxisX.size());
-    appendCount(m_nAxisLengthY, m_vecAxisY.size());
-    block.EndLine();
-    AppendAttributes(block);
-    dcm::AppendUnitLine(block, dcm::keyword::kEinheitX, m_strUnitX);
-    dcm::AppendUnitLine(block, dcm::keyword::kEinheitY, m_strUnitY);
-    dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnitW);
-    dcm::AppendSharedAxisLine(block, dcm::keyword::kSstX, m_strSharedXAxisUniqueName);
-    dcm::AppendSharedAxisLine(block, dcm::keyword::kSstY, m_strSharedYAxisUniqueName);
-    const std::size_t head = block.Size();
-    AppendValues(block);
-    if (block.Size() == head) {
+    appendCount(block.m_nAxisLengthX, block.m_vecAxisX.size());
+    appendCount(block.m_nAxisLengthY, block.m_vecAxisY.size());
+    text.EndLine();
+    ComposeAttributes(block, text);
+    AppendUnitLine(text, keyword::kEinheitX, block.m_strUnitX);
+    AppendUnitLine(text, keyword::kEinheitY, block.m_strUnitY);
+    AppendUnitLine(text, keyword::kEinheitW, block.m_strUnitW);
+    AppendSharedAxisLine(text, keyword::kSstX, block.m_strSharedXAxisUniqueName);
+    AppendSharedAxisLine(text, keyword::kSstY, block.m_strSharedYAxisUniqueName);
+    const std::size_t head = text.Size();
+    AppendPointLines(text, block.m_vecAxisX, block.m_vecAxisY, block.m_vecValues);
+    if (text.Size() == head) {
         // Without lines of points or values nothing at all is written.
-        block.Clear();
+        text.Truncate(start);
         return;
     }
-    dcm::AppendEnd(block);
+    AppendEnd(text);
 }
 
 CString DCMKennfeld::ExportValues(PravFile&) const
 {
     auto lines = dcm::FileTextBuilder::ForHost();
-    AppendValues(lines);
+    AppendPointLines(lines, m_vecAxisX, m_vecAxisY, m_vecValues);
     return lines.Wide();
-}
-
-void DCMKennfeld::AppendValues(dcm::FileTextBuilder& block) const
-{
-    const std::size_t width = m_vecAxisX.size();
-    if (width * m_vecAxisY.size() > m_vecValues.size())
-        return;
-    dcm::PointLines(block, dcm::kAxisX).AddGroup(m_vecAxisX);
-    dcm::PointLines axisY(block, dcm::kAxisY);
-    dcm::PointLines values(block, dcm::kValues);
-    std::span<const CComVariant> left(m_vecValues);
-    for (const CComVariant& point : m_vecAxisY) {
-        axisY.AddGroup({&point, 1});
-        values.AddGroup(left.first(width));
-        left = left.subspan(width);
-    }
 }
 
 HRESULT DCMKennfeld::AddValue(VARIANT value)

@@ -3,19 +3,11 @@
 #include "dcm/elements/basetype.h"
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
-#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
-#include "dcm/textfile/fileblock.h"
 
-#include <array>
 #include <cstdint>
-#include <string_view>
 #include <vector>
-
-namespace dcm {
-struct PointTarget;
-} // namespace dcm
 
 /// One KENNFELD: a map of values over the points of two axes, each of the three with a unit.
 ///
@@ -102,21 +94,14 @@ public:
     void RotateMap();
 
 protected:
-    /// Reads what follows the keyword of one line of points or values. Returns 0.
-    HRESULT AddValues(std::wstring_view rest, std::wstring_view keyword);
+    /// Reads what follows the keyword of one line of points or values and appends it. Returns 0.
+    HRESULT AddValues(const CString& strRest, const CString& strKeyword);
     /// The lines of points and values; empty when the values are too few for the axes. The file is
     /// not written to.
     CString ExportValues(PravFile& file) const;
 
 private:
-    friend class DCMConverter;
-    void ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block);
-    std::array<dcm::PointTarget, 3> PointTargets();
-    /// Init for the text of a file.
-    HRESULT ReadBlock(const dcm::FileBlock& block);
-    /// Composes the block in `block`, which is empty before.
-    void ComposeBlock(dcm::FileTextBuilder& block) const;
-    void AppendValues(dcm::FileTextBuilder& block) const;
+    friend struct dcm::BlockIo;
 
     CString m_strUnitX;
     CString m_strUnitY;

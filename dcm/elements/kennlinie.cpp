@@ -1,14 +1,36 @@
 #include "dcm/elements/kennlinie.h"
 
-#include "dcm/elements/block_lines.h"
-#include "dcm/elements/block_text.h"
+#include "dcm/elements/block_io.h"
+#include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
 #include "dcm/elements/points.h"
 #include "dcm/platform/text.h"
+#include "dcm/textfile/file_text.h"
+#include "dcm/textfile/file_text_builder.h"
 #include "dcm/textfile/pravfile.h"
 
+#include <array>
+#include <string_view>
 #include <utility>
+
+namespace {
+
+std::array<dcm::PointTarget, 2> TargetsOf(std::vector<CComVariant>& axis, VARTYPE& axisType,
+                                          std::vector<CComVariant>& values, VARTYPE& valueType)
+{
+    return {{{dcm::kAxisX, {axis, axisType}}, {dcm::kValues, {values, valueType}}}};
+}
+
+void AppendPointLines(dcm::FileTextBuilder& block, const std::vector<CComVariant>& axis,
+                      const std::vector<CComVariant>& values)
+{
+    dcm::PointLines(block, dcm::kAxisX).AddGroup(axis);
+    dcm::PointLines(block, dcm::kValues).AddGroup(values);
+}
+
+} // namespace
 
 DCMKennlinie::DCMKennlinie() : m_strKeyword(dcm::keyword::kKennlinie)
 {}
@@ -23,76 +45,86 @@ DCMKennlinie::~DCMKennlinie() = default;
 
 HRESULT DCMKennlinie::Init(const CString& strBlock)
 {
-    return ReadBlock(dcm::HostBlock(strBlock).Block());
+    return dcm::BlockIo::Read(dcm::HostBlock(strBlock).Block(), *this);
 }
 
-HRESULT DCMKennlinie::ReadBlock(const dcm::FileBlock& block)
+HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMKennlinie& block)
 {
-    const dcm::PointTarget targets[] = {
-        {dcm::kAxisX, {m_vecAxis, m_vtAxisType}},
-        {dcm::kValues, {m_vecValues, m_vtValueType}},
-    };
-    dcm::PointReader points(targets);
-    dcm::BlockLines lines(block);
-    dcm::BlockLine line;
-    while (lines.Next(line)) {
+    const auto targets =
+        TargetsOf(block.m_vecAxis, block.m_vtAxisType, block.m_vecValues, block.m_vtValueType);
+    const FileText& text = lines.Text();
+    PointReader points(targets, text);
+    BlockReader reader(lines);
+    BlockLine line;
+    while (reader.Next(line)) {
         // Most lines of a file are lines of points.
         if (points.Read(line))
             continue;
-        if (line.Is(m_strKeyword))
-            ReadFirstLine(dcm::TrimWhite(line.rest), block);
-        else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
+        if (line.Is(block.m_strKeyword)) {
+            // The name and the count; a line of one word is the count.
+            std::string_view rest = TrimWhite(line.rest);
+            block.SetName(text.Wide(TakeWord(rest)));
+            block.m_nAxisLengthX = ReadInteger(rest);
+            ReservePoints({{block.m_vecAxis, block.m_nAxisLengthX},
+                           {block.m_vecValues, block.m_nAxisLengthX}},
+                          lines);
+        } else if (ReadAttribute(line.keyword, TrimBlanksAndQuotes(line.rest), line.rest, text,
+                                 block)) {
             continue;
-        else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnitX = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
-        else if (line.Is(dcm::keyword::kEinheitW))
-            m_strUnitW = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
-        else if (line.Is(dcm::keyword::kStTxY))
+        } else if (line.Is(keyword::kEinheitX)) {
+            block.m_strUnitX = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+        } else if (line.Is(keyword::kEinheitW)) {
+            block.m_strUnitW = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+        } else if (line.Is(keyword::kStTxY)) {
             return E_FAIL;
-        else if (line.Is(dcm::keyword::kSstX))
-            m_strStuetzstellenverteilung = dcm::TrimBlanks(line.rest).SharedWide();
+        } else if (line.Is(keyword::kSstX)) {
+            block.m_strStuetzstellenverteilung = text.SharedWide(TrimBlanks(line.rest));
+        }
     }
     return S_OK;
 }
 
-/// The name and the count behind it; a line of one word is the count.
-void DCMKennlinie::ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block)
+HRESULT DCMKennlinie::AddValues(CString& strRest, const CString& strKeyword)
 {
-    SetName(dcm::TakeName(rest).Wide());
-    m_nAxisLengthX = dcm::ReadInteger(rest.bytes);
-    dcm::ReservePoints({{m_vecAxis, m_nAxisLengthX}, {m_vecValues, m_nAxisLengthX}}, block);
+    const auto targets = TargetsOf(m_vecAxis, m_vtAxisType, m_vecValues, m_vtValueType);
+    const auto keyword = dcm::FileText::OfHost(strKeyword);
+    const auto text = dcm::FileText::OfHost(strRest);
+    dcm::PointReader(targets, text).Read({keyword.Bytes(), text.Bytes()});
+    strRest.Empty();
+    return S_OK;
 }
 
 HRESULT DCMKennlinie::Export(PravFile& file)
 {
     auto block = dcm::FileTextBuilder::ForFile();
-    ComposeBlock(block);
+    dcm::BlockIo::Compose(*this, block);
     dcm::DropBlankUnit(m_strUnitX);
     dcm::DropBlankUnit(m_strUnitW);
-    file.WriteText(block);
+    dcm::WriteText(block, file);
     return S_OK;
 }
 
-void DCMKennlinie::ComposeBlock(dcm::FileTextBuilder& block) const
+void dcm::BlockIo::Compose(const DCMKennlinie& block, FileTextBuilder& text)
 {
-    block.Append(m_strKeyword).Append(L" ").Append(GetName());
-    if (m_nAxisLengthX > 0)
-        dcm::AppendCount(block, m_nAxisLengthX);
+    text.Append(block.m_strKeyword).AppendAscii(" ").Append(block.GetName());
+    if (block.m_nAxisLengthX > 0)
+        AppendCount(text, block.m_nAxisLengthX);
     else
-        dcm::AppendCount(block, m_vecValues.size());
-    block.EndLine();
-    AppendAttributes(block);
-    dcm::AppendUnitLine(block, dcm::keyword::kEinheitX, m_strUnitX);
-    dcm::AppendUnitLine(block, dcm::keyword::kEinheitW, m_strUnitW);
-    dcm::AppendSharedAxisLine(block, dcm::keyword::kSstX, m_strSharedAxisUniqueName);
-    ExportValues(block);
-    dcm::AppendEnd(block);
+        AppendCount(text, block.m_vecValues.size());
+    text.EndLine();
+    ComposeAttributes(block, text);
+    AppendUnitLine(text, keyword::kEinheitX, block.m_strUnitX);
+    AppendUnitLine(text, keyword::kEinheitW, block.m_strUnitW);
+    AppendSharedAxisLine(text, keyword::kSstX, block.m_strSharedAxisUniqueName);
+    AppendPointLines(text, block.m_vecAxis, block.m_vecValues);
+    AppendEnd(text);
 }
 
-void DCMKennlinie::ExportValues(dcm::FileTextBuilder& block) const
+CString DCMKennlinie::ExportValues(PravFile&) const
 {
-    dcm::PointLines(block, dcm::kAxisX).AddGroup(m_vecAxis);
-    dcm::PointLines(block, dcm::kValues).AddGroup(m_vecValues);
+    auto lines = dcm::FileTextBuilder::ForHost();
+    AppendPointLines(lines, m_vecAxis, m_vecValues);
+    return lines.Wide();
 }
 
 HRESULT DCMKennlinie::AddValue(VARIANT value)

@@ -3,14 +3,11 @@
 #include "dcm/elements/basetype.h"
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
-#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
-#include "dcm/textfile/fileblock.h"
 
 #include <cstdint>
 #include <list>
-#include <string_view>
 #include <vector>
 
 /// One KENNLINIE: a curve of axis points and the values over them, each with a unit.
@@ -89,13 +86,13 @@ public:
     CString GetStuetzstellenverteilung() const { return m_strStuetzstellenverteilung; }
 
 private:
-    friend class DCMConverter;
-    void ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block);
-    /// Init for the text of a file.
-    HRESULT ReadBlock(const dcm::FileBlock& block);
-    /// Composes the block in `block`, which is empty before.
-    void ComposeBlock(dcm::FileTextBuilder& block) const;
-    void ExportValues(dcm::FileTextBuilder& block) const;
+    friend struct dcm::BlockIo;
+
+    /// Reads what follows the keyword of one line of points or values and appends it. `strRest` is
+    /// empty afterwards. Returns 0.
+    HRESULT AddValues(CString& strRest, const CString& strKeyword);
+    /// The lines of points and values. The file is not written to.
+    CString ExportValues(PravFile& file) const;
 
     CString m_strUnitX;
     CString m_strUnitW;

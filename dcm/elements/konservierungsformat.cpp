@@ -1,9 +1,9 @@
 #include "dcm/elements/konservierungsformat.h"
 
-#include "dcm/elements/block_lines.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
 #include "dcm/platform/text.h"
+#include "dcm/textfile/file_text.h"
 #include "dcm/textfile/pravfile.h"
 
 #include <string_view>
@@ -14,7 +14,7 @@ DCMKonservierungsFormat::~DCMKonservierungsFormat() = default;
 
 HRESULT DCMKonservierungsFormat::Init(const CString& strBlock)
 {
-    const dcm::FileText block = dcm::FileTextOfHost(strBlock);
+    const auto block = dcm::FileText::OfHost(strBlock);
     const std::string_view text = block.Bytes();
     const std::size_t blank = text.find(' ');
     if (blank == text.npos)

@@ -17,7 +17,7 @@ public:
     DCMKonservierungsFormat& operator=(const DCMKonservierungsFormat&) = default;
     virtual ~DCMKonservierungsFormat();
 
-    /// Reads the version behind the keyword, with or without double quotes; a word that is no
+    /// Reads the version after the keyword, with or without double quotes; a word that is no
     /// number gives 0.0, any other text changes nothing. Returns 0.
     HRESULT Init(const CString& strBlock);
 

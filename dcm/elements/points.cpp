@@ -1,6 +1,5 @@
 #include "dcm/elements/points.h"
 
-#include "dcm/elements/block_lines.h"
 #include "dcm/elements/number.h"
 #include "dcm/platform/text.h"
 #include "dcm/platform/word.h"
@@ -14,7 +13,7 @@ namespace dcm {
 namespace {
 
 /// Besides line ends, the characters that a value block leaves as they are.
-constexpr TextItemStyle kPointText = {L"\n\r\t\b", L" "};
+constexpr TextItemStyle kPointText = {L"\n\r\t\b", " "};
 
 VARTYPE TypeWith(VARTYPE type, VARTYPE added)
 {
@@ -45,17 +44,15 @@ void ReadNumbers(std::string_view rest, const PointArray& array)
     }
 }
 
-/// A text begins behind an opening quote, which is whatever follows the text before it, and ends at
-/// the next quote or with the line.
-void ReadTexts(FileTextView line, const PointArray& array)
+/// A text begins after an opening quote, which is any character that follows the text before it,
+/// and ends at the next quote or with the line.
+void ReadTexts(std::string_view rest, const FileText& text, const PointArray& array)
 {
-    std::string_view& rest = line.bytes;
     while (!rest.empty()) {
-        line.DropFirst();
+        rest = text.WithoutFirstCharacter(rest);
         const std::size_t end = rest.find('"');
-        const FileTextView text = {rest.substr(0, end), line.file};
+        AppendPoint(array, CComVariant(text.Wide(rest.substr(0, end))));
         rest = end == rest.npos ? std::string_view() : TrimWhite(rest.substr(end + 1));
-        AppendPoint(array, CComVariant(text.Wide()));
     }
 }
 
@@ -89,20 +86,21 @@ void ReservePoints(std::initializer_list<AnnouncedPoints> arrays, const FileBloc
     for (const AnnouncedPoints& array : arrays)
         left -= std::clamp(array.count, std::int64_t{0}, left + 1);
     for (const AnnouncedPoints& array : arrays) {
-        // An array in use grows by itself: room made time and again would copy it each time.
+        // An array that has points grows by itself: reserving exactly would copy it on each line.
         if (left >= 0 && array.count > 0 && array.points.empty())
             array.points.reserve(static_cast<std::size_t>(array.count));
     }
 }
 
-void ReadPoints(FileTextView rest, const PointArray* numbers, const PointArray* texts)
+void ReadPoints(std::string_view rest, const FileText& text, const PointArray* numbers,
+                const PointArray* texts)
 {
     rest = TrimWhite(rest);
-    if (rest.bytes.starts_with('"') && rest.bytes.ends_with('"')) {
+    if (rest.starts_with('"') && rest.ends_with('"')) {
         if (texts != nullptr)
-            ReadTexts(rest, *texts);
+            ReadTexts(rest, text, *texts);
     } else if (numbers != nullptr) {
-        ReadNumbers(rest.bytes, *numbers);
+        ReadNumbers(rest, *numbers);
     }
 }
 
@@ -123,7 +121,7 @@ bool PointReader::Read(const BlockLine& line)
     }
     if (m_last->numbers == nullptr && m_last->texts == nullptr)
         return false;
-    ReadPoints(line.rest, m_last->numbers, m_last->texts);
+    ReadPoints(line.rest, m_text, m_last->numbers, m_last->texts);
     return true;
 }
 

@@ -1,12 +1,12 @@
 #pragma once
 
-#include "dcm/elements/block_lines.h"
-#include "dcm/elements/block_text.h"
+#include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/platform/automation.h"
-#include "dcm/platform/codepage.h"
-#include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
+#include "dcm/textfile/file_text.h"
+#include "dcm/textfile/file_text_builder.h"
 
 #include <cstdint>
 #include <initializer_list>
@@ -38,13 +38,15 @@ struct AnnouncedPoints
     std::int64_t count;
 };
 
-/// Makes room for the points that a block announces, unless they are more in all than its text can
-/// hold.
+/// Reserves memory for the points that a block announces, unless they are more in all than its text
+/// can hold.
 void ReservePoints(std::initializer_list<AnnouncedPoints> arrays, const FileBlock& block);
 
-/// Reads the items of one point line of a file's text: quoted texts when it begins and ends with a
-/// double quote, numbers otherwise. Items of a kind without an array are dropped.
-void ReadPoints(FileTextView rest, const PointArray* numbers, const PointArray* texts);
+/// Reads the items of one point line, `rest`, which is a part of `text`: quoted texts when it
+/// begins and ends with a double quote, numbers otherwise. Items of a kind without an array are
+/// dropped.
+void ReadPoints(std::string_view rest, const FileText& text, const PointArray* numbers,
+                const PointArray* texts);
 
 /// Replaces `target` by copies of the points, each text its own; leaves it as it was when memory
 /// runs out.
@@ -73,13 +75,15 @@ struct PointTarget
 class PointReader
 {
 public:
-    /// The targets must outlive the reader.
-    explicit PointReader(std::span<const PointTarget> targets) : m_targets(targets) {}
+    /// For lines of `text`. The text and the targets must outlive the reader.
+    PointReader(std::span<const PointTarget> targets, const FileText& text)
+        : m_targets(targets), m_text(text)
+    {}
     PointReader(const PointReader&) = delete;
     PointReader& operator=(const PointReader&) = delete;
 
-    /// Reads a point line of a file's text; false when it has the keyword of no target. Numbers
-    /// under the keyword of texts are dropped, and the reverse.
+    /// Reads a point line; false when it has the keyword of no target. Numbers under the keyword of
+    /// texts are dropped, and the reverse.
     bool Read(const BlockLine& line);
 
 private:
@@ -101,7 +105,8 @@ private:
     void Find(std::string_view keyword, Line& line) const;
 
     std::span<const PointTarget> m_targets;
-    /// Most lines have the keyword of the one in front of them, or of the last with another.
+    const FileText& m_text;
+    /// Most lines have the keyword of the line before them, or of the last line with another one.
     Line m_lines[2];
     Line* m_last = m_lines;
     Line* m_other = m_lines + 1;

@@ -1,13 +1,17 @@
 #include "dcm/elements/stuetzstellenverteilung.h"
 
-#include "dcm/elements/block_lines.h"
-#include "dcm/elements/block_text.h"
+#include "dcm/elements/block_io.h"
+#include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
 #include "dcm/elements/points.h"
 #include "dcm/platform/text.h"
+#include "dcm/textfile/file_text.h"
+#include "dcm/textfile/file_text_builder.h"
 #include "dcm/textfile/pravfile.h"
 
+#include <string_view>
 #include <utility>
 
 DCMStuetzstellenverteilung::DCMStuetzstellenverteilung() = default;
@@ -23,66 +27,69 @@ DCMStuetzstellenverteilung::~DCMStuetzstellenverteilung() = default;
 
 HRESULT DCMStuetzstellenverteilung::Init(const CString& strBlock)
 {
-    return ReadBlock(dcm::HostBlock(strBlock).Block());
+    return dcm::BlockIo::Read(dcm::HostBlock(strBlock).Block(), *this);
 }
 
-HRESULT DCMStuetzstellenverteilung::ReadBlock(const dcm::FileBlock& block)
+HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMStuetzstellenverteilung& block)
 {
-    dcm::BlockLines lines(block);
-    dcm::BlockLine line;
-    while (lines.Next(line)) {
-        if (line.Is(dcm::keyword::kStuetzstellenverteilung))
-            ReadFirstLine(dcm::TrimWhite(line.rest), block);
-        else if (ReadAttribute(line.keyword, dcm::TrimBlanksAndQuotes(line.rest), line.rest))
+    // Numbers and texts are told apart by the quotes alone, not by the keyword.
+    const PointArray values{block.m_vecValues, block.m_vtValueType};
+    const FileText& text = lines.Text();
+    BlockReader reader(lines);
+    BlockLine line;
+    while (reader.Next(line)) {
+        if (line.Is(keyword::kStuetzstellenverteilung)) {
+            std::string_view rest = TrimWhite(line.rest);
+            block.SetName(text.Wide(TakeWord(rest)));
+            ReservePoints({{block.m_vecValues, ReadInteger(rest)}}, lines);
+        } else if (ReadAttribute(line.keyword, TrimBlanksAndQuotes(line.rest), line.rest, text,
+                                 block)) {
             continue;
-        else if (line.Is(dcm::keyword::kEinheitX))
-            m_strUnit = dcm::TrimBlanksAndQuotes(line.rest).SharedWide();
-        else if (line.Is(dcm::keyword::kStX) || line.Is(dcm::keyword::kStTxX))
-            AddValues(line.rest);
-        else if (line.Is(dcm::keyword::kStTxY) || line.Is(dcm::keyword::kText))
+        } else if (line.Is(keyword::kEinheitX)) {
+            block.m_strUnit = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+        } else if (line.Is(keyword::kStX) || line.Is(keyword::kStTxX)) {
+            ReadPoints(line.rest, text, &values, &values);
+        } else if (line.Is(keyword::kStTxY) || line.Is(keyword::kText)) {
             return E_FAIL;
+        }
     }
     return S_OK;
 }
 
-/// The name. The count behind it says how much room to make.
-void DCMStuetzstellenverteilung::ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block)
-{
-    SetName(dcm::TakeName(rest).Wide());
-    dcm::ReservePoints({{m_vecValues, dcm::ReadInteger(rest.bytes)}}, block);
-}
-
-/// Numbers and texts are told apart by the quotes alone.
-HRESULT DCMStuetzstellenverteilung::AddValues(dcm::FileTextView rest)
+HRESULT DCMStuetzstellenverteilung::AddValues(CString& strRest)
 {
     const dcm::PointArray values{m_vecValues, m_vtValueType};
-    dcm::ReadPoints(rest, &values, &values);
+    const auto text = dcm::FileText::OfHost(strRest);
+    dcm::ReadPoints(text.Bytes(), text, &values, &values);
+    strRest.Empty();
     return S_OK;
 }
 
 HRESULT DCMStuetzstellenverteilung::Export(PravFile& file)
 {
     auto block = dcm::FileTextBuilder::ForFile();
-    ComposeBlock(block);
+    dcm::BlockIo::Compose(*this, block);
     dcm::DropBlankUnit(m_strUnit);
-    file.WriteText(block);
+    dcm::WriteText(block, file);
     return S_OK;
 }
 
-void DCMStuetzstellenverteilung::ComposeBlock(dcm::FileTextBuilder& block) const
+void dcm::BlockIo::Compose(const DCMStuetzstellenverteilung& block, FileTextBuilder& text)
 {
-    block.Append(dcm::keyword::kStuetzstellenverteilung).Append(L" ").Append(GetName());
-    dcm::AppendCount(block, m_vecValues.size());
-    block.EndLine().Append(dcm::keyword::kSst).EndLine();
-    AppendAttributes(block);
-    dcm::AppendUnitLine(block, dcm::keyword::kEinheitX, m_strUnit);
-    ExportValues(block);
-    dcm::AppendEnd(block);
+    text.Append(keyword::kStuetzstellenverteilung).AppendAscii(" ").Append(block.GetName());
+    AppendCount(text, block.m_vecValues.size());
+    text.EndLine().Append(keyword::kSst).EndLine();
+    ComposeAttributes(block, text);
+    AppendUnitLine(text, keyword::kEinheitX, block.m_strUnit);
+    PointLines(text, kAxisX).AddGroup(block.m_vecValues);
+    AppendEnd(text);
 }
 
-void DCMStuetzstellenverteilung::ExportValues(dcm::FileTextBuilder& block) const
+CString DCMStuetzstellenverteilung::ExportValues(PravFile&) const
 {
-    dcm::PointLines(block, dcm::kAxisX).AddGroup(m_vecValues);
+    auto lines = dcm::FileTextBuilder::ForHost();
+    dcm::PointLines(lines, dcm::kAxisX).AddGroup(m_vecValues);
+    return lines.Wide();
 }
 
 HRESULT DCMStuetzstellenverteilung::AddValue(CComVariant value)

@@ -3,12 +3,9 @@
 #include "dcm/elements/basetype.h"
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
-#include "dcm/platform/codepage.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
-#include "dcm/textfile/fileblock.h"
 
-#include <string_view>
 #include <vector>
 
 /// One STUETZSTELLENVERTEILUNG: a named list of axis points that curves and maps share by naming
@@ -58,14 +55,13 @@ public:
     void SetUnit(const CString& strUnit) { m_strUnit = strUnit; }
 
 private:
-    friend class DCMConverter;
-    void ReadFirstLine(dcm::FileTextView rest, const dcm::FileBlock& block);
-    HRESULT AddValues(dcm::FileTextView rest);
-    /// Init for the text of a file.
-    HRESULT ReadBlock(const dcm::FileBlock& block);
-    /// Composes the block in `block`, which is empty before.
-    void ComposeBlock(dcm::FileTextBuilder& block) const;
-    void ExportValues(dcm::FileTextBuilder& block) const;
+    friend struct dcm::BlockIo;
+
+    /// Reads the numbers or quoted texts of one line and appends them. `strRest` is empty
+    /// afterwards. Returns 0.
+    HRESULT AddValues(CString& strRest);
+    /// The lines of points. The file is not written to.
+    CString ExportValues(PravFile& file) const;
 
     CString m_strUnit;
     std::vector<CComVariant> m_vecValues;

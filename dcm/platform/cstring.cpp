@@ -1,8 +1,8 @@
 #include "dcm/platform/cstring.h"
 
-#include "dcm/platform/codepage.h"
 #include "dcm/platform/exception.h"
 #include "dcm/platform/text.h"
+#include "dcm/platform/thread_code_page.h"
 
 #include <algorithm>
 #include <cwchar>

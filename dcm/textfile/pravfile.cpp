@@ -1,40 +1,48 @@
 #include "dcm/textfile/pravfile.h"
 
-#include "dcm/platform/file_text_builder.h"
 #include "dcm/platform/system_file.h"
+#include "dcm/platform/text.h"
+#include "dcm/textfile/file_text.h"
+#include "dcm/textfile/file_text_builder.h"
 
-#include <algorithm>
 #include <cstddef>
-#include <cstring>
+#include <cstdint>
 #include <limits>
-#include <string>
+#include <string_view>
 #include <utility>
 
 namespace {
 
-/// Text of 2 GiB and more has no place in a file of this format; UTF-8 may become that long where
-/// the file is not.
-void CheckSize(ULONGLONG size)
-{
-    if (size > std::numeric_limits<std::int32_t>::max())
-        throw CFileException(CFileException::fileTooLarge, 0, CString());
-}
+constexpr ULONGLONG kSizeMax = std::numeric_limits<std::int32_t>::max();
 
-/// Cuts the next line off, without its line feed and the carriage returns before that. A zero, the
-/// one behind the text if there is no other, ends what can be found.
-bool TakeLine(std::string_view& rest, std::string_view& line)
+/// Takes the next line without its line feed and the carriage returns before that.
+bool TakeFileLine(std::string_view& rest, std::string_view& line)
 {
-    const char* const lineFeed = rest.empty() ? nullptr : std::strchr(rest.data(), '\n');
-    if (lineFeed == nullptr)
+    if (!dcm::TakeLine(rest, line))
         return false;
-    line = {rest.data(), lineFeed};
-    while (line.ends_with('\r'))
-        line.remove_suffix(1);
-    rest.remove_prefix(static_cast<std::size_t>(lineFeed + 1 - rest.data()));
+    line = dcm::TrimRight(line, [](char c) { return c == '\r'; });
     return true;
 }
 
 } // namespace
+
+/// The text of the open file and how much of it has been handed out.
+struct PravFile::Content
+{
+    dcm::FileText m_strContent;
+    std::int32_t m_nReadPos = 0;
+    /// The number of the line at `m_nReadPos`, counted from 1.
+    std::int32_t m_nLine = 1;
+
+    std::string_view Rest() const
+    {
+        return m_strContent.Bytes().substr(static_cast<std::size_t>(m_nReadPos));
+    }
+    void SetRest(std::string_view rest)
+    {
+        m_nReadPos = static_cast<std::int32_t>(m_strContent.Bytes().size() - rest.size());
+    }
+};
 
 PravFile::PravFile() noexcept = default;
 
@@ -47,7 +55,7 @@ PravFile::~PravFile() = default;
 
 BOOL PravFile::Open(const wchar_t* path, UINT flags, CFileException* error)
 {
-    DropContent();
+    m_pContent.reset();
     const BOOL opened = CFile::Open(path, flags, error);
     LoadContent(flags);
     return opened;
@@ -55,57 +63,58 @@ BOOL PravFile::Open(const wchar_t* path, UINT flags, CFileException* error)
 
 void PravFile::LoadContent(UINT flags)
 {
-    DropContent();
+    m_pContent.reset();
     CFileStatus status;
-    if (!GetStatus(status) || (flags & modeWrite) != 0)
+    if ((flags & modeWrite) != 0 || !GetStatus(status))
         return;
-    const ULONGLONG length = GetLength();
-    CheckSize(length);
-    dcm::FileText content(length, dcm::Encoding::kWindows1252);
-    char* const bytes = content.bytes.get();
-    dcm::system::ExpectToFill(bytes, length);
-    content.EndAt(Read(bytes, static_cast<UINT>(length)));
-    content = dcm::FileTextFromThreadCodePage(std::move(content));
-    CheckSize(content.size);
-    m_content = std::move(content);
+    if (status.m_size > kSizeMax)
+        throw CFileException(CFileException::fileTooLarge, 0, CString());
+    auto content = std::make_unique<Content>();
+    dcm::TextBuffer bytes(status.m_size);
+    dcm::system::ExpectToFill(bytes.Data(), status.m_size);
+    bytes.EndAt(Read(bytes.Data(), static_cast<UINT>(status.m_size)));
+    content->m_strContent = dcm::FileText::OfFile(std::move(bytes));
+    // A conversion to UTF-8 may lengthen the text.
+    if (content->m_strContent.Bytes().size() > kSizeMax)
+        throw CFileException(CFileException::fileTooLarge, 0, CString());
+    m_pContent = std::move(content);
 }
 
 int PravFile::ReadLine(CString& line)
 {
     line.Empty();
-    std::string_view rest = Rest();
-    std::string_view bytes;
-    if (!TakeLine(rest, bytes))
+    if (!m_pContent)
         return 0;
-    KeepRest(rest);
-    dcm::AppendWide(line, bytes, m_content.encoding);
+    std::string_view rest = m_pContent->Rest();
+    std::string_view bytes;
+    if (!TakeFileLine(rest, bytes))
+        return 0;
+    m_pContent->SetRest(rest);
+    ++m_pContent->m_nLine;
+    m_pContent->m_strContent.AppendWide(line, bytes);
     return 1;
 }
 
-bool PravFile::ReadBlock()
+/// Takes the lines up to the next empty one; `block` has no lines where two empty lines meet.
+/// Returns false when no empty line follows: what is left is dropped.
+bool PravFile::ReadBlock(dcm::FileBlock& block)
 {
-    m_block.Clear();
-    std::string_view rest = Rest();
+    if (!m_pContent)
+        return false;
+    block.Begin(m_pContent->m_strContent, m_pContent->m_nLine);
+    std::string_view rest = m_pContent->Rest();
     std::string_view line;
     bool more = false;
-    while ((more = TakeLine(rest, line)) && !line.empty())
-        m_block.AddLine(line);
-    KeepRest(rest);
+    while ((more = TakeFileLine(rest, line)) && !line.empty())
+        block.AddLine(line);
+    m_pContent->SetRest(rest);
+    m_pContent->m_nLine = block.LineNumber(block.LineCount()) + (more ? 1 : 0);
     return more;
 }
 
 int PravFile::WriteText(const CString& text)
 {
-    dcm::FileTextBuilder builder = dcm::FileTextBuilder::ForFile();
-    WriteText(builder.Append(text));
+    auto builder = dcm::FileTextBuilder::ForFile();
+    dcm::WriteText(builder.Append(text), *this);
     return 1;
-}
-
-void PravFile::WriteText(const dcm::FileTextBuilder& text)
-{
-    std::string converted;
-    const std::string_view bytes = dcm::ToThreadCodePage(text.Bytes(), converted);
-    CheckSize(bytes.size());
-    if (!bytes.empty())
-        Write(bytes.data(), static_cast<UINT>(bytes.size()));
 }

@@ -1,13 +1,13 @@
 #pragma once
 
 #include "dcm/platform/cstring.h"
-#include "dcm/platform/file_text_builder.h"
+#include "dcm/textfile/file_text_builder.h"
 
 #include <concepts>
 #include <string>
 #include <string_view>
 
-/// Composing the text of one block, line by line; the builder knows how lines end.
+/// Composing the text of one block, line by line.
 namespace dcm {
 
 /// Appends the indent and the keyword.
@@ -19,11 +19,11 @@ void AppendLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_
 /// Appends an indented line: keyword, blank, value in double quotes. Nothing is escaped.
 void AppendQuotedLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view value);
 
-/// Appends the line of a unit: none for an empty unit; a unit of one blank stands for a line with
-/// an empty unit.
+/// Appends the line of a unit: none for an empty unit; the line of an empty unit for a unit of one
+/// blank.
 void AppendUnitLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view unit);
 
-/// What export does to a unit of one blank once its line is written: it becomes empty.
+/// Makes a unit of one blank empty, as export does after its line is written.
 void DropBlankUnit(CString& unit);
 
 /// Appends the not indented line that names a shared distribution; none for an empty name.
@@ -34,7 +34,7 @@ void AppendSharedAxisLine(FileTextBuilder& block, std::wstring_view keyword,
 template <std::integral Count>
 void AppendCount(FileTextBuilder& block, Count count)
 {
-    block.Append(L" ").Append(std::to_wstring(count));
+    block.AppendAscii(" ").AppendAscii(std::to_string(count));
 }
 
 /// Appends "END" and the empty line without which a reader drops the block.
@@ -46,7 +46,7 @@ struct TextItemStyle
     /// Characters that would break the line; each is written as a full stop.
     std::wstring_view replaced;
     /// What follows the closing quote.
-    std::wstring_view trailer;
+    std::string_view trailer;
 };
 
 /// Appends a blank and the text in double quotes. Nothing is escaped.

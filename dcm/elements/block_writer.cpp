@@ -1,4 +1,4 @@
-#include "dcm/elements/block_text.h"
+#include "dcm/elements/block_writer.h"
 
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
@@ -38,13 +38,13 @@ void BeginLine(FileTextBuilder& block, std::wstring_view keyword)
 void AppendLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view value)
 {
     BeginLine(block, keyword);
-    block.Append(L" ").Append(value).EndLine();
+    block.AppendAscii(" ").Append(value).EndLine();
 }
 
 void AppendQuotedLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view value)
 {
     BeginLine(block, keyword);
-    block.Append(L" \"").Append(value).Append(L"\"").EndLine();
+    block.AppendAscii(" \"").Append(value).AppendAscii("\"").EndLine();
 }
 
 void AppendUnitLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view unit)
@@ -62,26 +62,26 @@ void DropBlankUnit(CString& unit)
 void AppendSharedAxisLine(FileTextBuilder& block, std::wstring_view keyword, std::wstring_view name)
 {
     if (!name.empty())
-        block.Append(keyword).Append(L" ").Append(name).EndLine();
+        block.Append(keyword).AppendAscii(" ").Append(name).EndLine();
 }
 
 void AppendEnd(FileTextBuilder& block)
 {
-    block.Append(keyword::kEnd).Append(L"\n\n");
+    block.Append(keyword::kEnd).EndLine().EndLine();
 }
 
 void AppendQuotedText(FileTextBuilder& block, std::wstring_view text, const TextItemStyle& style)
 {
-    block.Append(L" \"");
+    block.AppendAscii(" \"");
     for (;;) {
         const std::size_t end = text.find_first_of(style.replaced);
         block.Append(text.substr(0, end));
         if (end == text.npos)
             break;
-        block.Append(L".");
+        block.AppendAscii(".");
         text.remove_prefix(end + 1);
     }
-    block.Append(L"\"").Append(style.trailer);
+    block.AppendAscii("\"").AppendAscii(style.trailer);
 }
 
 void ItemLines::AddNumber(std::wstring_view keyword, double number, int digits)

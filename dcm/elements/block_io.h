@@ -1,0 +1,54 @@
+#pragma once
+
+#include "dcm/platform/automation.h"
+
+#include <string_view>
+
+class DCMBaseType;
+class DCMFestwert;
+class DCMFestwerteblock;
+class DCMKennfeld;
+class DCMKennlinie;
+class DCMStuetzstellenverteilung;
+class PravFile;
+
+namespace dcm {
+
+class FileBlock;
+class FileText;
+class FileTextBuilder;
+
+/// How blocks are read from the bytes of a file and composed as such bytes. It is the one friend of
+/// the file and of the classes of blocks, whose headers show nothing of this.
+struct BlockIo
+{
+    /// Loads the text of the open file. Throws `CFileException` when reading fails.
+    static void Load(PravFile& file);
+    /// Takes the lines of the file up to the next empty one; none where two empty lines meet.
+    /// Returns false when no empty line follows. The block is valid until the file is opened anew.
+    static bool Next(PravFile& file, FileBlock& block);
+
+    /// `Init` for the lines of a block. A failure leaves what was read before it.
+    static HRESULT Read(const FileBlock& lines, DCMFestwert& block);
+    static HRESULT Read(const FileBlock& lines, DCMFestwerteblock& block);
+    static HRESULT Read(const FileBlock& lines, DCMStuetzstellenverteilung& block);
+    static HRESULT Read(const FileBlock& lines, DCMKennlinie& block);
+    static HRESULT Read(const FileBlock& lines, DCMKennfeld& block);
+
+    /// Appends the text of the block, which stays as it is.
+    static void Compose(const DCMFestwert& block, FileTextBuilder& text);
+    static void Compose(const DCMFestwerteblock& block, FileTextBuilder& text);
+    static void Compose(const DCMStuetzstellenverteilung& block, FileTextBuilder& text);
+    static void Compose(const DCMKennlinie& block, FileTextBuilder& text);
+    /// Appends nothing when the map has too few values for its axes, or no line at all.
+    static void Compose(const DCMKennfeld& block, FileTextBuilder& text);
+
+    /// Stores `value` when `keyword` is LANGNAME or DISPLAYNAME, `function` when it is FUNKTION;
+    /// otherwise returns false. Both are parts of `text`.
+    static bool ReadAttribute(std::string_view keyword, std::string_view value,
+                              std::string_view function, const FileText& text, DCMBaseType& block);
+    /// Appends the lines of LANGNAME, DISPLAYNAME and FUNKTION.
+    static void ComposeAttributes(const DCMBaseType& block, FileTextBuilder& text);
+};
+
+} // namespace dcm

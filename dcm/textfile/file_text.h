@@ -1,0 +1,170 @@
+#pragma once
+
+#include "dcm/platform/cstring.h"
+#include "dcm/platform/encoding.h"
+#include "dcm/platform/word.h"
+#include "dcm/textfile/shared_texts.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+#include <memory>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+/// The text of a file, or of a host, as bytes: its lines and its blocks. The bytes are decoded only
+/// where a wide text is kept, since wide text takes four times the memory.
+namespace dcm {
+
+/// Bytes with `kReadAhead` zeros after them.
+class TextBuffer
+{
+public:
+    /// No bytes, and no memory for them.
+    TextBuffer() = default;
+    /// Memory for up to `room` bytes. `EndAt` must be called after they are written.
+    explicit TextBuffer(std::size_t room)
+        : m_bytes(std::make_unique_for_overwrite<char[]>(room + kReadAhead))
+    {}
+
+    char* Data() { return m_bytes.get(); }
+    /// Sets the number of bytes and writes the zeros after them.
+    void EndAt(std::size_t size)
+    {
+        m_size = size;
+        std::memset(m_bytes.get() + size, 0, kReadAhead);
+    }
+    /// The bytes, valid as long as this object or the one that it is moved to.
+    std::string_view Bytes() const { return {m_bytes.get(), m_size}; }
+
+private:
+    std::unique_ptr<char[]> m_bytes;
+    std::size_t m_size = 0;
+};
+
+/// A text in an encoding that can be cut at any ASCII character. Lines end at its first zero byte.
+class FileText
+{
+public:
+    /// An empty text.
+    FileText() = default;
+    /// The content of a file in the thread's code page. Where that page has to be converted by the
+    /// system, the text is UTF-8 and ends at the first zero.
+    static FileText OfFile(TextBuffer content);
+    /// A text of the host. Every character comes back; no byte is zero.
+    static FileText OfHost(std::wstring_view text);
+
+    std::string_view Bytes() const { return m_buffer.Bytes(); }
+
+    /// The wide form of a part of the text, or of other bytes in its encoding. Bytes that are no
+    /// character in UTF-8 become U+FFFD.
+    CString Wide(std::string_view part) const { return Decode(part, m_encoding); }
+    void AppendWide(CString& text, std::string_view part) const
+    {
+        AppendDecoded(text, part, m_encoding);
+    }
+    /// The wide form of a part of the text that a file is likely to repeat: equal texts share their
+    /// memory.
+    CString SharedWide(std::string_view part) const
+    {
+        return m_shared ? m_shared->Get(part, m_encoding) : Wide(part);
+    }
+    /// `part`, which must not be empty, without its first character.
+    std::string_view WithoutFirstCharacter(std::string_view part) const
+    {
+        return dcm::WithoutFirstCharacter(part, m_encoding);
+    }
+
+private:
+    FileText(TextBuffer buffer, Encoding encoding)
+        : m_buffer(std::move(buffer)), m_encoding(encoding)
+    {}
+
+    TextBuffer m_buffer;
+    Encoding m_encoding = Encoding::kUtf8;
+    /// None for a text of the host, which is a single block.
+    std::unique_ptr<SharedTexts> m_shared;
+};
+
+/// Takes the next line, without its line feed, off `rest`, which is the end of a text. Returns
+/// false when no line feed follows before the first zero.
+inline bool TakeLine(std::string_view& rest, std::string_view& line)
+{
+    const char* const lineFeed = rest.empty() ? nullptr : std::strchr(rest.data(), '\n');
+    if (lineFeed == nullptr)
+        return false;
+    line = {rest.data(), lineFeed};
+    rest.remove_prefix(line.size() + 1);
+    return true;
+}
+
+/// One block of a text: its lines without their line ends. The text must outlive the block.
+class FileBlock
+{
+public:
+    /// Makes this a block without lines, whose first line will be line `number` of `text`, counted
+    /// from 1. The memory of the former lines is kept.
+    void Begin(const FileText& text, std::int32_t number)
+    {
+        m_text = &text;
+        m_firstNumber = number;
+        m_lines.clear();
+    }
+    /// Adds the next line, which must be a part of the text.
+    void AddLine(std::string_view line)
+    {
+        const auto begin = static_cast<std::uint32_t>(line.data() - m_text->Bytes().data());
+        m_lines.push_back({begin, begin + static_cast<std::uint32_t>(line.size())});
+    }
+
+    /// The text that the lines are part of.
+    const FileText& Text() const { return *m_text; }
+    std::size_t LineCount() const { return m_lines.size(); }
+    std::string_view Line(std::size_t index) const
+    {
+        const char* const start = m_text->Bytes().data();
+        return {start + m_lines[index].begin, start + m_lines[index].end};
+    }
+    /// The number of a line in the text, counted from 1.
+    std::int32_t LineNumber(std::size_t index) const
+    {
+        return m_firstNumber + static_cast<std::int32_t>(index);
+    }
+    /// The number of bytes from the first line to the last.
+    std::size_t Size() const
+    {
+        return m_lines.empty() ? 0 : m_lines.back().end - m_lines.front().begin;
+    }
+
+private:
+    /// Positions in the text, which is smaller than 4 GiB.
+    struct Span
+    {
+        std::uint32_t begin;
+        std::uint32_t end;
+    };
+
+    const FileText* m_text = nullptr;
+    std::int32_t m_firstNumber = 1;
+    std::vector<Span> m_lines;
+};
+
+/// A block's text that comes from the host: text after the last line feed is not read, and a text
+/// that begins with a line feed has no lines.
+class HostBlock
+{
+public:
+    /// Throws `std::bad_alloc` for a text of 4 GiB and more.
+    explicit HostBlock(std::wstring_view text);
+    HostBlock(const HostBlock&) = delete;
+    HostBlock& operator=(const HostBlock&) = delete;
+
+    const FileBlock& Block() const { return m_block; }
+
+private:
+    FileText m_text;
+    FileBlock m_block;
+};
+
+} // namespace dcm
