@@ -72,10 +72,11 @@ void Check(const Stage& stage, const Contestant& contestant, std::string& export
     if (contestant.name == "export/dcm" || contestant.name == "export/floor" ||
         contestant.name == "export/snprintf") {
         std::string text = FileText(stage.outputFile);
-        if (exported.empty())
+        if (exported.empty()) {
             exported = std::move(text);
-        else if (text != exported)
+        } else if (text != exported) {
             throw std::runtime_error(contestant.name + " writes another file");
+        }
     }
 }
 

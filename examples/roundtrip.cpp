@@ -35,10 +35,11 @@ Values ValuesOf(const Block& block)
 template <class Block>
 const CString& UnitOf(const Block& block)
 {
-    if constexpr (requires { block.GetUnit_W(); })
+    if constexpr (requires { block.GetUnit_W(); }) {
         return block.GetUnit_W();
-    else
+    } else {
         return block.GetUnit();
+    }
 }
 
 std::string TextOf(const VARIANT& value)
@@ -80,9 +81,10 @@ void Show(const char* kind, const Blocks& blocks)
         unitWidth = std::max(unitWidth, UnitOf(block).GetLength());
     }
     std::printf("\n%s\n", kind);
-    for (const auto& block : blocks)
+    for (const auto& block : blocks) {
         std::printf("  %s  %s  %s\n", Column(block.GetName(), nameWidth).c_str(),
                     Column(UnitOf(block), unitWidth).c_str(), Summary(ValuesOf(block)).c_str());
+    }
 }
 
 } // namespace

@@ -132,11 +132,12 @@ TEST(Allocation, FailureIsRaisedByTheCallsOfABlock)
             auto blocks = (s.source.*get)();
             auto block(blocks.front());
             block = blocks.back();
-            for (int pass = 0; pass < 2; ++pass)
+            for (int pass = 0; pass < 2; ++pass) {
                 block.Init(CString(
                     L"KENNFELD n 1 1\nKENNLINIE n 1\nSTUETZSTELLENVERTEILUNG n 1\nFESTWERT n\n"
                     L"LANGNAME \"l\"\nEINHEIT_W \"w\"\nWERT 1 2\nST/X 1\nST/Y 1\nST_TX/X \"a\"\n"
                     L"TEXT \"a\" \"b\"\n"));
+            }
             PravFile file(path, kCreate);
             block.Export(file);
             (s.target.*add)(blocks.back());

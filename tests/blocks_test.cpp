@@ -13,10 +13,11 @@ template <class Value, class... Rest>
 std::string Fields(const char* label, const Value& value, const Rest&... rest)
 {
     std::string text;
-    if constexpr (std::is_same_v<Value, std::string>)
+    if constexpr (std::is_same_v<Value, std::string>) {
         text = value;
-    else if (value != Value())
+    } else if (value != Value()) {
         text = Show(value);
+    }
     if (!text.empty())
         text = std::string(" ") + label + " " + text;
     if constexpr (sizeof...(rest) > 0)
