@@ -54,10 +54,15 @@ function plot(width, {title, titleX, titleW, unitX, unitW, series}) {
 
   const svg = draw('svg', {width, height: HEIGHT, viewBox: `0 0 ${width} ${HEIGHT}`, tabindex: 0,
     role: 'slider', 'aria-label': title + ', points', 'aria-valuemin': 1});
-  for (const [y, label] of ticksW)
+  let free = HEIGHT; // where the next label has room
+  for (const [y, label] of ticksW) {
+    if (y > free)
+      continue;
+    free = y - 14;
     svg.append(draw('line', {class: 'grid', x1: left, x2: right, y1: y, y2: y}),
                draw('text', {'text-anchor': 'end', x: left - 6, y: y + 4}, label));
-  let free = 0;
+  }
+  free = 0;
   for (const [place, whole] of x.labels()) {
     const label = cut(whole, Math.min(130, width / 3));
     const half = widthOf(label) / 2;
