@@ -40,6 +40,21 @@ std::string Html(std::wstring_view text)
 
 // ---- The model for the script ----------------------------------------------------------------
 
+void AppendKey(std::string& json, std::string_view key)
+{
+    json += '"';
+    json += key;
+    json += R"(":)";
+}
+
+/// Ends a list, or an object, each of whose elements ended with a comma.
+void AppendEnd(std::string& json, char end)
+{
+    if (json.back() == ',')
+        json.pop_back();
+    json += end;
+}
+
 /// Texts that repeat, such as units: each is in the page once.
 class SharedTexts
 {
@@ -59,7 +74,7 @@ public:
             AppendJsonText(json, *text);
             json += ',';
         }
-        json.back() = ']';
+        AppendEnd(json, ']');
     }
 
 private:
@@ -67,19 +82,19 @@ private:
     std::vector<const CString*> m_texts;
 };
 
-/// Appends `"key":[...]`, one element for each block, and a comma.
+/// Appends a list with one element for each block under a key, and a comma.
 template <class Append>
 void AppendColumn(std::string& json, std::string_view key, const Content& content, Append append)
 {
-    json.append("\"").append(key).append("\":[");
+    AppendKey(json, key);
+    json += '[';
     for (const PageKind& kind : content.kinds)
         for (const PageBlock& block : kind.blocks) {
             append(block);
             json += ',';
         }
-    if (json.back() == ',')
-        json.pop_back();
-    json += "],\n";
+    AppendEnd(json, ']');
+    json += ",\n";
 }
 
 constexpr struct
@@ -98,17 +113,22 @@ constexpr struct
 
 void AppendKinds(std::string& json, const Content& content)
 {
-    static constexpr const char* kLooks[] = {"row", "list", "curve", "map"};
-    json += "\"kinds\":[";
+    static constexpr std::wstring_view kLooks[] = {L"row", L"list", L"curve", L"map"};
+    AppendKey(json, "kinds");
+    json += '[';
     for (const PageKind& kind : content.kinds) {
-        json += "{\"keyword\":";
+        json += '{';
+        AppendKey(json, "keyword");
         AppendJsonText(json, KeywordOf(kind.kind));
-        json.append(",\"look\":\"").append(kLooks[static_cast<std::size_t>(kind.look)]);
-        json.append("\",\"count\":").append(std::to_string(kind.blocks.size())).append("},");
+        json += ',';
+        AppendKey(json, "look");
+        AppendJsonText(json, kLooks[static_cast<std::size_t>(kind.look)]);
+        json += ',';
+        AppendKey(json, "count");
+        json += std::to_string(kind.blocks.size()) + "},";
     }
-    if (json.back() == ',')
-        json.pop_back();
-    json += "],\n";
+    AppendEnd(json, ']');
+    json += ",\n";
 }
 
 void AppendFindings(std::string& json, const PageFile& file)
@@ -121,11 +141,11 @@ void AppendFindings(std::string& json, const PageFile& file)
             AppendJsonText(json, finding.block);
             json += ',';
             AppendJsonText(json, finding.message);
-            json.append(",\"").append(finding.id).append("\"],");
+            json += R"(,")";
+            json += finding.id;
+            json += R"("],)";
         }
-    if (json.back() == ',')
-        json.pop_back();
-    json += ']';
+    AppendEnd(json, ']');
 }
 
 /// 0 for the same, then as `Change`: 1 changed, 2 added, 3 removed.
@@ -146,7 +166,8 @@ char ChangeDigit(const PageBlock& block)
 
 std::string ModelOf(const Content& content)
 {
-    std::string json = "{\"title\":";
+    std::string json = "{";
+    AppendKey(json, "title");
     AppendJsonText(json, content.file.title);
     json += ",\n";
     AppendKinds(json, content);
@@ -166,17 +187,19 @@ std::string ModelOf(const Content& content)
                  [&](const PageBlock& b) { json += std::to_string(ShapeOf(*b.parameter).rows); });
     if (content.other != nullptr) {
         AppendColumn(json, "change", content, [&](const PageBlock& b) { json += ChangeDigit(b); });
-        json += "\"other\":";
+        AppendKey(json, "other");
         AppendJsonText(json, content.other->title);
         json += ",\n";
     }
-    json += "\"findings\":[";
+    AppendKey(json, "findings");
+    json += '[';
     AppendFindings(json, content.file);
     if (content.other != nullptr) {
         json += ',';
         AppendFindings(json, *content.other);
     }
-    json += "],\n\"texts\":";
+    json += "],\n";
+    AppendKey(json, "texts");
     texts.AppendTo(json);
     json += "}";
     return json;
@@ -184,22 +207,22 @@ std::string ModelOf(const Content& content)
 
 // ---- The values for the script ---------------------------------------------------------------
 
-/// Appends `"key":[...],`.
+/// Appends a list under a key, and a comma.
 void AppendValues(std::string& json, const char* key, const std::vector<CComVariant>& values)
 {
-    json.append("\"").append(key).append("\":[");
+    AppendKey(json, key);
+    json += '[';
     for (const CComVariant& value : values) {
         AppendJsonValue(json, value);
         json += ',';
     }
-    if (json.back() == ',')
-        json.pop_back();
-    json += "],";
+    AppendEnd(json, ']');
+    json += ',';
 }
 
 void AppendText(std::string& json, const char* key, const CString& text)
 {
-    json.append("\"").append(key).append("\":");
+    AppendKey(json, key);
     AppendJsonText(json, text);
     json += ',';
 }
@@ -209,7 +232,8 @@ void AppendOther(std::string& json, const PageBlock& block)
 {
     const Parameter& own = *block.parameter;
     const Parameter& other = *block.other;
-    json += "\"o\":{";
+    AppendKey(json, "o");
+    json += '{';
     if (own.langname != other.langname)
         AppendText(json, "langname", other.langname);
     for (const auto& column : kSharedColumns)
@@ -225,8 +249,10 @@ void AppendOther(std::string& json, const PageBlock& block)
         AppendValues(json, "y", other.y.points);
     // The values of a map change their places with its axes.
     const Shape shape = ShapeOf(other);
-    json += "\"columns\":" + std::to_string(shape.columns) +
-            ",\"rows\":" + std::to_string(shape.rows) + "},";
+    AppendKey(json, "columns");
+    json += std::to_string(shape.columns) + ',';
+    AppendKey(json, "rows");
+    json += std::to_string(shape.rows) + "},";
 }
 
 void AppendBlock(std::string& json, const PageBlock& block)
@@ -240,7 +266,7 @@ void AppendBlock(std::string& json, const PageBlock& block)
         AppendValues(json, "y", parameter.y.points);
     if (block.other != nullptr)
         AppendOther(json, block);
-    json.back() = '}';
+    AppendEnd(json, '}');
 }
 
 /// Writes the values in pieces, so that the script reads only those of the blocks in view.
