@@ -4,6 +4,7 @@ import base64
 import json
 import os
 import pathlib
+import select
 import shutil
 import subprocess
 import tempfile
@@ -23,10 +24,10 @@ def find():
 
 
 class Browser:
-    """One tab. `complaints` holds what the console said and which requests were made for other
-    than the page itself."""
+    """One tab. `complaints` holds what the console said, and the requests for anything but the page
+    itself. Whatever takes longer than `timeout` seconds is an error."""
 
-    def __init__(self, *flags, timeout=120):
+    def __init__(self, *flags, timeout=60):
         self._timeout = timeout
         self._folder = tempfile.TemporaryDirectory(ignore_cleanup_errors=True)
         to_browser, self._out = os.pipe()
@@ -72,6 +73,8 @@ class Browser:
 
     def _receive(self):
         while (end := self._buffer.find(b"\0")) < 0:
+            if not select.select([self._in], [], [], self._timeout)[0]:
+                raise RuntimeError(f"the browser has said nothing for {self._timeout} s")
             piece = os.read(self._in, 1 << 20)
             if not piece:
                 raise RuntimeError("the browser has ended")
