@@ -20,7 +20,7 @@ function mapDifference(map, other) {
   const reach = Math.max(Math.abs(low), Math.abs(high));
   const range = {low: -reach, high: reach, empty};
   const table = grid({
-    columns, rows, label: `${name[id]}, difference`, corner: 'y \\ x',
+    columns, rows, label: `${name[id]}, difference`, look: 'map diverging', corner: 'y \\ x',
     head: column => pointOrIndex(x, column), side: row => pointOrIndex(y, row),
     cell: (row, column) => {
       const i = row * columns + column;
@@ -34,7 +34,6 @@ function mapDifference(map, other) {
           `${withUnit(shown(w[i]), map.unit)} → ${withUnit(shown(to), other.unit)}`};
     },
   });
-  table.firstChild.classList.add('map', 'diverging');
   return make('div', {}, table, colorLegend(range, map.unit, true));
 }
 

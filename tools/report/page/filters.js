@@ -29,4 +29,5 @@ listHeight = list.clientHeight;
 find();
 showNow();
 jumpToHash();
-requestIdleCallback?.(() => haystack ?? makeHaystack());
+finish();
+window.requestIdleCallback?.(() => haystack ?? makeHaystack());

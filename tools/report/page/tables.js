@@ -1,10 +1,11 @@
 const MOST_CELLS = 4000, MOST_COLUMNS = 200;
 
 /**
- * A table of rows and columns with a head for each. `cell` says what stands at a row and column:
- * {text, share, tip, kind}. Large ones are cut; a button shows more.
+ * A table of rows and columns with a head for each. `cell` says what is at a row and column:
+ * {text, share, tip, kind}. `look` is its class. Large ones are cut; a button shows more.
  */
-function grid({columns, rows, head, side, corner, cell, label}, most = MOST_CELLS) {
+function grid(content, most = MOST_CELLS) {
+  const {columns, rows, head, side, corner, cell, label, look = ''} = content;
   const wide = Math.min(columns, Math.max(MOST_COLUMNS, Math.floor(most / Math.max(rows, 1))));
   const high = Math.min(rows, Math.max(1, Math.floor(most / Math.max(wide, 1))));
   const body = make('tbody');
@@ -21,7 +22,7 @@ function grid({columns, rows, head, side, corner, cell, label}, most = MOST_CELL
         element.style.setProperty('--t', found.share.toFixed(3));
     }
   }
-  const table = make('table', {class: 'grid', 'aria-label': label}, body);
+  const table = make('table', {class: 'grid ' + look, 'aria-label': label}, body);
   if (head) {
     const top = make('tr', {}, make('th', {scope: 'col'}, corner));
     for (let column = 0; column < wide; ++column)
@@ -33,8 +34,7 @@ function grid({columns, rows, head, side, corner, cell, label}, most = MOST_CELL
   if (wide < columns || high < rows)
     box.append(button(`Show more: these are ${many(wide)} of ${many(columns)} columns and ` +
                       `${many(high)} of ${many(rows)} rows`,
-                      () => box.replaceWith(grid({columns, rows, head, side, corner, cell, label},
-                                                 most * 8))));
+                      () => box.replaceWith(grid(content, most * 8))));
   return box;
 }
 
@@ -144,7 +144,7 @@ function mapTable(map) {
   const {id, columns, x, y, w} = map;
   const range = rangeOf(w);
   const table = grid({
-    columns, rows: Math.max(Math.ceil(w.length / columns), y.length), label: name[id],
+    columns, rows: Math.max(Math.ceil(w.length / columns), y.length), label: name[id], look: 'map',
     corner: 'y \\ x', head: column => pointOrIndex(x, column), side: row => pointOrIndex(y, row),
     cell: (row, column) => {
       const i = row * columns + column;
@@ -154,7 +154,6 @@ function mapTable(map) {
           withUnit(shown(w[i]), map.unit)};
     },
   });
-  table.firstChild.classList.add('map');
   return make('div', {}, table, colorLegend(range, map.unit));
 }
 

@@ -5,7 +5,8 @@ const main = document.querySelector('main');
 const blocks = document.getElementById('blocks');
 let windowStart = 0;
 let groups = new Map(); // element -> {from, to, kind, drawn}
-let landing = null;     // the block that the page has jumped to
+let here = null;        // the block that the page has jumped to last
+let landing = null;     // the same until somebody scrolls
 
 const observer = new IntersectionObserver(entries => {
   for (const {target, isIntersecting, boundingClientRect} of entries) {
@@ -78,10 +79,15 @@ function drawGroup(element, group) {
     parts.push(group.kind.look === 'row' ? rowOf(id) :
       cardOf(id, group.kind.look, inner(isWide(id) ? wide : narrow)));
   }
+  const hadFocus = element.contains(document.activeElement);
   element.style.minHeight = '';
   element.replaceChildren(...parts);
   if (!valuesOf(hits[group.to - 1]))
     unfinished.add(element);
+  const mark = here === null ? null : element.querySelector('#b' + here);
+  mark?.classList.add('here');
+  if (hadFocus)
+    mark?.querySelector('[tabindex]').focus({preventScroll: true});
   if (landing !== null)
     land();
 }
@@ -91,15 +97,21 @@ function emptyGroup(element, group, height) {
   setGap(element, group, height);
 }
 
-// Groups that were drawn before their values had been read.
+// Groups that were drawn before the browser had read their values.
 const unfinished = new Set();
 function finish() {
-  for (const element of unfinished)
-    if (groups.get(element)?.drawn) {
-      groups.get(element).drawn = false;
-      drawGroup(element, groups.get(element));
+  for (const element of [...unfinished]) {
+    const group = groups.get(element);
+    if (group?.drawn && !valuesOf(hits[group.to - 1]))
+      continue;
+    unfinished.delete(element);
+    if (group?.drawn) {
+      group.drawn = false;
+      drawGroup(element, group);
     }
-  unfinished.clear();
+  }
+  if (document.readyState === 'loading')
+    setTimeout(finish, 100);
 }
 document.addEventListener('readystatechange', finish);
 
@@ -182,11 +194,11 @@ function jump(id) {
   showNow();
   if (place < windowStart || place >= windowStart + WINDOW)
     showFrom(Math.max(0, place - ROWS_OF_GROUP));
+  document.querySelector('.here')?.classList.remove('here');
+  here = landing = id;
   for (const [element, group] of groups)
     if (group.from <= place && place < group.to)
       drawGroup(element, group);
-  landing = id;
-  document.querySelector('.here')?.classList.remove('here');
   const element = document.getElementById('b' + id);
   element.classList.add('here');
   element.querySelector('[tabindex]').focus({preventScroll: true});
