@@ -1,5 +1,6 @@
 // roundtrip IN.dcm [OUT.dcm]
-// Prints what is in a DCM file, in UTF-8, and writes it again.
+// Prints what is in a DCM file, in UTF-8, and writes it again with its comment and the names of the
+// axes that blocks share. What it cannot read or keep is reported on standard error.
 #include "dcm/library/dcm.h"
 
 #include <algorithm>
@@ -11,38 +12,7 @@
 
 namespace {
 
-using Values = std::vector<CComVariant>;
-
-/// The value of a FESTWERT or TEXTSTRING, the values of a block, curve or map, the points of a
-/// distribution.
-template <class Block>
-Values ValuesOf(const Block& block)
-{
-    Values values;
-    if constexpr (requires { block.GetDoubleValues(); }) {
-        for (const double number : block.GetDoubleValues())
-            values.emplace_back(number);
-        for (const CString& text : block.GetStringValues())
-            values.emplace_back(text);
-    } else if constexpr (requires { block.GetValues(values); }) {
-        block.GetValues(values);
-    } else {
-        block.GetValue(&values.emplace_back());
-    }
-    return values;
-}
-
-template <class Block>
-const CString& UnitOf(const Block& block)
-{
-    if constexpr (requires { block.GetUnit_W(); }) {
-        return block.GetUnit_W();
-    } else {
-        return block.GetUnit();
-    }
-}
-
-std::string TextOf(const VARIANT& value)
+std::string TextOf(const CComVariant& value)
 {
     if (value.vt == VT_BSTR)
         return '"' + dcm::ToUtf8(CComVariant::TextOf(value)) + '"';
@@ -52,39 +22,32 @@ std::string TextOf(const VARIANT& value)
     return {digits, std::to_chars(digits, std::end(digits), value.dblVal).ptr};
 }
 
-/// The first values, and the count of all values if there are more.
-std::string Summary(const Values& values)
+/// Prints name, unit and first values of a parameter or points of a distribution.
+void Print(const dcm::Parameter& parameter)
 {
+    const bool isAxis = parameter.kind == dcm::Kind::kStuetzstellenverteilung;
+    const std::vector<CComVariant>& values = isAxis ? parameter.x.points : parameter.values;
+    const CString& unit = isAxis ? parameter.x.unit : parameter.unit;
+    std::string line = "  " + dcm::ToUtf8(parameter.name);
+    if (!unit.IsEmpty())
+        line += " [" + dcm::ToUtf8(unit) + "]";
     constexpr std::size_t kMostShown = 6;
-    std::string summary;
     for (std::size_t i = 0; i < std::min(values.size(), kMostShown); ++i)
-        summary += (i == 0 ? "" : "  ") + TextOf(values[i]);
+        line += "  " + TextOf(values[i]);
     if (values.size() > kMostShown)
-        summary += "  ... (" + std::to_string(values.size()) + ")";
-    return summary;
+        line += "  ... (" + std::to_string(values.size()) + ")";
+    std::printf("%s\n", line.c_str());
 }
 
-/// `text` in UTF-8, padded with blanks to `width` characters.
-std::string Column(const CString& text, int width)
+/// Prints the findings of an import or export, and returns whether it succeeded.
+bool Succeeded(HRESULT result, const char* path, const dcm::Report& report)
 {
-    const int missing = std::max(width - text.GetLength(), 0);
-    return dcm::ToUtf8(text) + std::string(static_cast<std::size_t>(missing), ' ');
-}
-
-template <class Blocks>
-void Show(const char* kind, const Blocks& blocks)
-{
-    int nameWidth = 0;
-    int unitWidth = 0;
-    for (const auto& block : blocks) {
-        nameWidth = std::max(nameWidth, block.GetName().GetLength());
-        unitWidth = std::max(unitWidth, UnitOf(block).GetLength());
+    for (const dcm::Finding& finding : report.Findings()) {
+        std::fprintf(stderr, "%s:%lld: %s: %s\n", path, static_cast<long long>(finding.line),
+                     dcm::ToUtf8(dcm::NameOf(finding.severity)).c_str(),
+                     dcm::ToUtf8(finding.message).c_str());
     }
-    std::printf("\n%s\n", kind);
-    for (const auto& block : blocks) {
-        std::printf("  %s  %s  %s\n", Column(block.GetName(), nameWidth).c_str(),
-                    Column(UnitOf(block), unitWidth).c_str(), Summary(ValuesOf(block)).c_str());
-    }
+    return SUCCEEDED(result);
 }
 
 } // namespace
@@ -97,25 +60,25 @@ int main(int argc, char** argv)
     }
 
     DCMConverter document;
-    if (FAILED(document.Import(dcm::FromUtf8(argv[1])))) {
-        std::fprintf(stderr, "roundtrip: cannot read %s\n", argv[1]);
+    dcm::Report report;
+    if (!Succeeded(dcm::Import(document, dcm::FromUtf8(argv[1]), report), argv[1], report))
         return 1;
-    }
 
     std::printf("%s", dcm::ToUtf8(document.GetComment()).c_str());
-    Show("FESTWERT", document.GetFestwerte());
-    Show("FESTWERTEBLOCK", document.GetFestwerteblock());
-    Show("STUETZSTELLENVERTEILUNG", document.GetStuetzstellenverteilung());
-    Show("KENNLINIE", document.GetKennlinie());
-    Show("FESTKENNLINIE", document.GetFestkennlinie());
-    Show("GRUPPENKENNLINIE", document.GetGruppenkennlinie());
-    Show("KENNFELD", document.GetKennfeld());
-    Show("FESTKENNFELD", document.GetFestkennfeld());
-    Show("GRUPPENKENNFELD", document.GetGruppenkennfeld());
-    Show("TEXTSTRING", document.GetTextstring());
-
-    if (argc == 3 && FAILED(document.Export(dcm::FromUtf8(argv[2])))) {
-        std::fprintf(stderr, "roundtrip: cannot write %s\n", argv[2]);
-        return 1;
+    DCMConverter written;
+    written.SetHeader(dcm::HeaderOfComment(document.GetComment()));
+    const std::vector<dcm::Parameter> parameters = dcm::ParametersOf(document);
+    for (const dcm::Kind kind : dcm::kKinds) {
+        std::printf("\n%s\n", dcm::ToUtf8(dcm::KeywordOf(kind)).c_str());
+        for (const dcm::Parameter& parameter : parameters) {
+            if (parameter.kind == kind) {
+                Print(parameter);
+                dcm::Add(written, parameter);
+            }
+        }
     }
+
+    if (argc == 3 &&
+        !Succeeded(dcm::Save(written, dcm::FromUtf8(argv[2]), report), argv[2], report))
+        return 1;
 }

@@ -4,10 +4,13 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <atomic>
 #include <cstdlib>
 #include <functional>
 #include <new>
+#include <span>
+#include <vector>
 
 using namespace test;
 
@@ -177,6 +180,38 @@ TEST(Allocation, FailureIsRaisedByTheOtherCalls)
     };
     for (const auto& [name, operation] : cases)
         FailEach(name, true, operation);
+}
+
+TEST(Allocation, FailureIsRaisedByTheCallsForParameters)
+{
+    static std::vector<dcm::Parameter> parameters;
+    DCMConverter document;
+    ASSERT_EQ(ImportBytes(document, ReadBytes(CString(DCM_ALL_KINDS))), S_OK);
+    parameters = dcm::ParametersOf(document);
+    // One of each kind, the last, which has the most content.
+    for (const dcm::Kind kind : dcm::kKinds) {
+        const auto last = std::find_if(parameters.rbegin(), parameters.rend(),
+                                       [&](const auto& p) { return p.kind == kind; });
+        ASSERT_NE(last, parameters.rend());
+        FailEach(dcm::ToUtf8(dcm::KeywordOf(kind)).c_str(), true,
+                 [&](State& s) { dcm::Add(s.target, *last); });
+        FailEach("by moving", true, [&](State& s) { dcm::Add(s.target, dcm::Parameter(*last)); });
+    }
+    FailEach("parameters", true, [](State& s) { dcm::ParametersOf(s.source); });
+    FailEach("parameters by moving", true,
+             [](State& s) { dcm::ParametersOf(DCMConverter(s.source)); });
+    // Two that are removed, and others that have the content of another one.
+    static std::vector<dcm::Parameter> others(parameters.begin() + 2, parameters.end());
+    for (std::size_t i = 0; i + 1 < others.size(); ++i) {
+        others[i].x = parameters[i].x;
+        others[i].values = parameters[i].values;
+        others[i].function = parameters[i].function;
+    }
+    FailEach("differences", true, [](State&) { dcm::Differences(parameters, others); });
+    FailEach("additions", true, [](State&) { dcm::Differences({}, others); });
+    FailEach("comment", true, [](State&) { dcm::HeaderOfComment(L"a long comment\n* of lines"); });
+    parameters.clear();
+    others.clear();
 }
 
 TEST(Allocation, IsNotForPointsThatABlockCannotHold)

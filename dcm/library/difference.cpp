@@ -216,9 +216,10 @@ void JoinEqual(const Points& oldPoints, const Points& newPoints, PointPairs& pai
 Indices Unpaired(const Indices& pairs, const Points& points)
 {
     Indices left;
-    for (std::size_t i = 0; i < pairs.size(); ++i)
+    for (std::size_t i = 0; i < pairs.size(); ++i) {
         if (pairs[i] == kNoIndex && points[i].vt == VT_R8)
             left.push_back(i);
+    }
     return left;
 }
 
@@ -238,12 +239,13 @@ void JoinNear(const Points& oldPoints, const Points& newPoints, const Comparison
     while (o != oldLeft.end() && n != newLeft.end()) {
         const double a = oldPoints[*o].dblVal;
         const double b = newPoints[*n].dblVal;
-        if (AreNear(a, b, comparison))
+        if (AreNear(a, b, comparison)) {
             pairs.Join(*o++, *n++);
-        else if ((a < b) != falling)
+        } else if ((a < b) != falling) {
             ++o;
-        else
+        } else {
             ++n;
+        }
     }
 }
 
@@ -282,12 +284,14 @@ void ComparePoints(const PointPairs& pairs, ValueList& points)
         points.CompareByIndex();
         return;
     }
-    for (std::size_t i = 0; i < pairs.toNew.size(); ++i)
+    for (std::size_t i = 0; i < pairs.toNew.size(); ++i) {
         if (pairs.toNew[i] == kNoIndex)
             points.AddOld(i);
-    for (std::size_t i = 0; i < pairs.toOld.size(); ++i)
+    }
+    for (std::size_t i = 0; i < pairs.toOld.size(); ++i) {
         if (pairs.toOld[i] == kNoIndex)
             points.AddNew(i);
+    }
 }
 
 /// Where a value of one side is on the other, which has the points of `pairsX` and `pairsY`.
@@ -310,14 +314,16 @@ void CompareGrids(const PointPairs& x, const PointPairs& y, std::size_t oldCount
 {
     for (std::size_t i = 0; i < oldCount; ++i) {
         const std::size_t other = OtherIndex(i, x.toNew, y.toNew, x.toOld.size(), y.toOld.size());
-        if (other < newCount)
+        if (other < newCount) {
             values.Compare(i, other);
-        else
+        } else {
             values.AddOld(i);
+        }
     }
-    for (std::size_t i = 0; i < newCount; ++i)
+    for (std::size_t i = 0; i < newCount; ++i) {
         if (OtherIndex(i, x.toOld, y.toOld, x.toNew.size(), y.toNew.size()) >= oldCount)
             values.AddNew(i);
+    }
 }
 
 // ---- Parameters -------------------------------------------------------------------------------
@@ -376,7 +382,7 @@ void CompareTexts(Field field, const CString& oldText, const CString& newText,
 
 CString TextOf(std::int64_t count)
 {
-    return CString(std::to_wstring(count));
+    return {std::to_wstring(count)};
 }
 
 void CompareCounts(Field field, Count oldCount, Count newCount,

@@ -57,9 +57,10 @@ CComVariant Plain(const CComVariant& value)
 /// Takes the value away from points that the block does not write.
 void DropUnwritten(std::vector<CComVariant>& points)
 {
-    for (CComVariant& point : points)
+    for (CComVariant& point : points) {
         if (point.vt != VT_R8 && point.vt != VT_BSTR)
             point = CComVariant();
+    }
 }
 
 template <class Block>
@@ -89,10 +90,11 @@ DCMFestwerteblock ListBlock(const Parameter& parameter)
     block.SetXValueCount(parameter.countX);
     block.SetYValueCount(parameter.countY);
     for (const CComVariant& value : parameter.values) {
-        if (value.vt == VT_BSTR)
+        if (value.vt == VT_BSTR) {
             block.AddValue(CString(CComVariant::TextOf(value)));
-        else
+        } else {
             block.AddValue(NumberOf(value).value_or(0.0));
+        }
     }
     return block;
 }
@@ -149,9 +151,10 @@ std::wstring_view KeywordOf(Kind kind) noexcept
 
 std::optional<Kind> KindOf(std::wstring_view keyword) noexcept
 {
-    for (const Kind kind : kKinds)
+    for (const Kind kind : kKinds) {
         if (std::ranges::equal(keyword, KeywordOf(kind), {}, FoldCase, FoldCase))
             return kind;
+    }
     return std::nullopt;
 }
 
@@ -196,10 +199,11 @@ Parameter ParameterOf(const DCMStuetzstellenverteilung& block)
 Parameter ParameterOf(const DCMKennlinie& block)
 {
     Kind kind = Kind::kKennlinie;
-    if (dynamic_cast<const DCMFestkennlinie*>(&block) != nullptr)
+    if (dynamic_cast<const DCMFestkennlinie*>(&block) != nullptr) {
         kind = Kind::kFestkennlinie;
-    else if (dynamic_cast<const DCMGruppenkennlinie*>(&block) != nullptr)
+    } else if (dynamic_cast<const DCMGruppenkennlinie*>(&block) != nullptr) {
         kind = Kind::kGruppenkennlinie;
+    }
     Parameter parameter = Named(kind, block);
     parameter.x.unit = block.GetUnit_X();
     parameter.x.distribution = block.GetStuetzstellenverteilung();
@@ -216,10 +220,11 @@ Parameter ParameterOf(const DCMKennlinie& block)
 Parameter ParameterOf(const DCMKennfeld& block)
 {
     Kind kind = Kind::kKennfeld;
-    if (dynamic_cast<const DCMFestkennfeld*>(&block) != nullptr)
+    if (dynamic_cast<const DCMFestkennfeld*>(&block) != nullptr) {
         kind = Kind::kFestkennfeld;
-    else if (dynamic_cast<const DCMGruppenkennfeld*>(&block) != nullptr)
+    } else if (dynamic_cast<const DCMGruppenkennfeld*>(&block) != nullptr) {
         kind = Kind::kGruppenkennfeld;
+    }
     Parameter parameter = Named(kind, block);
     parameter.x.unit = block.GetUnit_X();
     parameter.x.distribution = block.GetStuetzstellenverteilungX();
