@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <bit>
 #include <chrono>
 #include <cstdint>
 #include <tuple>
@@ -12,11 +13,12 @@ using namespace test;
 
 namespace {
 
-/// A variant of this tag whose content is zero.
-VARIANT Tagged(VARTYPE tag)
+/// A variant of this tag, its content zero unless told.
+VARIANT Tagged(VARTYPE tag, std::int64_t content = 0)
 {
     VARIANT variant{};
     variant.vt = tag;
+    variant.llVal = content;
     return variant;
 }
 
@@ -79,7 +81,10 @@ TEST(Festwert, WritesAValueOfAnyTag)
         {-(std::int64_t{1} << 40), VT_I8, "WERT -1099511627776.0"},
         {~std::uint64_t{0}, VT_UI8, "WERT 1.8446744073709552e+019"},
         {0.5F, VT_R4, "WERT 0.5"},
-        {true, VT_BOOL, "WERT 1.0"}};
+        {true, VT_BOOL, "WERT 1.0"},
+        {Tagged(VT_DATE, std::bit_cast<std::int64_t>(-45678.75)), VT_DATE, "WERT -45678.75"},
+        {Tagged(VT_CY, -12'345'678), VT_CY, "WERT -1234.5678"},
+        {Tagged(VT_NULL, -1), VT_NULL, "WERT 0.0"}};
     for (const auto& [value, tag, line] : cases) {
         DCMTextstring block;
         block.SetUnit(L" ");
@@ -90,6 +95,16 @@ TEST(Festwert, WritesAValueOfAnyTag)
         EXPECT_EQ(Written(block),
                   "TEXTSTRING \n    LANGNAME \"\"\n    EINHEIT_W \"\"\n    " + line + "\nEND\n\n");
     }
+}
+
+TEST(Festwert, TakesAPlainNumber)
+{
+    DCMFestwert block;
+    // A literal zero is a null pointer too.
+    EXPECT_EQ(block.SetValue(0), S_OK);
+    EXPECT_EQ(block.GetValueType(), VT_I4);
+    EXPECT_EQ(block.SetValue(2.5), S_OK);
+    EXPECT_EQ(Written(block), "FESTWERT \n    LANGNAME \"\"\n    WERT 2.5\nEND\n\n");
 }
 
 TEST(Festwerteblock, WritesWhatTheHostAdds)

@@ -3,6 +3,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdint>
 #include <limits>
 #include <new>
 #include <thread>
@@ -50,6 +51,18 @@ TEST(Text, ComparesAndRefusesWhatIsOutside)
     const char* const noBytes = nullptr;
     EXPECT_EQ(text + CString(noText) + CString("\xB5") + CString(noBytes), L"ab\u00B5");
 }
+
+// A constant cannot read another member than the one that was set.
+static_assert(CComVariant(static_cast<signed char>(-1)).cVal == -1);
+static_assert(CComVariant(std::uint8_t{255}).bVal == 255);
+static_assert(CComVariant(std::int16_t{-2}).iVal == -2);
+static_assert(CComVariant(std::uint16_t{65535}).uiVal == 65535);
+static_assert(CComVariant(-7).lVal == -7);
+static_assert(CComVariant(7U).ulVal == 7);
+static_assert(CComVariant(std::int64_t{-1} << 40).llVal == std::int64_t{-1} << 40);
+static_assert(CComVariant(~std::uint64_t{0}).ullVal == ~std::uint64_t{0});
+static_assert(CComVariant(true).boolVal == VARIANT_TRUE);
+static_assert(CComVariant(0.5F).fltVal == 0.5F);
 
 TEST(Variant, OwnsItsText)
 {

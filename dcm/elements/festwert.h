@@ -6,6 +6,8 @@
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/variant.h"
 
+#include <type_traits>
+
 /// One FESTWERT: a named single value, a number or a text, with its unit.
 class DCM_API DCMFestwert : public DCMBaseType
 {
@@ -28,7 +30,8 @@ public:
     HRESULT Init(const CString& strBlock);
 
     /// Writes the block in one piece. A text gives a TEXT line; its line ends become full stops.
-    /// Any other value gives a WERT line with the number that it stands for, 0.0 if it has none.
+    /// Any other value gives a WERT line with its number: that of an integer or a float, 1.0 or 0.0
+    /// of a truth value, days of a date, units of a currency; 0.0 of a value without a number.
     /// A unit of one blank is written as an empty one and is empty afterwards. Returns 0; a failed
     /// write is thrown as `CFileException`.
     HRESULT Export(PravFile& file);
@@ -41,6 +44,12 @@ public:
     /// text cannot be copied the value becomes `VT_ERROR`, and the failure is raised.
     HRESULT SetValue(const VARIANT& value) { return SetValue(&value); }
     HRESULT SetValue(const VARIANT* pValue);
+    /// Stores a number or truth value; returns 0. A literal zero is a number, `nullptr` is not.
+    template <class Number>
+    HRESULT SetValue(Number value) requires std::is_arithmetic_v<Number>
+    {
+        return SetValue(CComVariant(value));
+    }
     /// The tag of the value: `VT_EMPTY` without one, `VT_R8` for a number, `VT_BSTR` for a text.
     VARTYPE GetValueType() const { return m_value.vt; }
 

@@ -2,6 +2,13 @@
 
 namespace dcm {
 
+namespace {
+
+/// A currency is an integer; this many are one unit.
+constexpr double kCurrencyUnit = 10'000.0;
+
+} // namespace
+
 std::optional<double> NumberOf(const VARIANT& value) noexcept
 {
     switch (value.vt) {
@@ -29,6 +36,10 @@ std::optional<double> NumberOf(const VARIANT& value) noexcept
         return static_cast<double>(value.llVal);
     case VT_UI8:
         return static_cast<double>(value.ullVal);
+    case VT_DATE:
+        return value.date;
+    case VT_CY:
+        return static_cast<double>(value.cyVal.int64) / kCurrencyUnit;
     default:
         return std::nullopt;
     }

@@ -62,12 +62,12 @@ VARIANT CComVariant::Detach() noexcept
 
 void CComVariant::OwnCopy()
 {
-    // Nothing to copy, whatever the tag: an absent text, a point without a value.
+    // There is nothing to copy, whatever the tag, in an absent text or a point without a value.
     constexpr std::size_t head = offsetof(VARIANT, llVal);
     const VARIANT nothing = {};
     if (std::memcmp(&llVal, &nothing.llVal, sizeof(VARIANT) - head) == 0)
         return;
-    // Not constant: the system's own function takes its source as one that may be written.
+    // Not constant, because the system's function takes a pointer to a source that is not.
     VARIANT other = *this;
     VariantInit(this);
     const HRESULT result = VariantCopy(this, &other);

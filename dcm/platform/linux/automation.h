@@ -7,17 +7,30 @@
 /// @file
 /// Result codes, variants and their texts, named as on Windows and with the same meaning.
 
-/// The numbers that the calls below take and give.
+/// Types of arguments and results, named as on Windows.
 using BOOL = int;
 using UINT = unsigned int;
 using LONG = std::int32_t;
 using ULONGLONG = unsigned long long;
 using VARTYPE = unsigned short;
 using VARIANT_BOOL = short;
+/// Days since 30 December 1899; the fraction is the time of day.
+using DATE = double;
+/// An amount of money in units of 1/10000.
+struct CY
+{
+    std::int64_t int64;
+};
 
-/// The values of `BOOL`; any other than 0 counts as `TRUE`.
+// A header that comes before this one may have the names as macros.
+#ifndef FALSE
+/// The `BOOL` 0, for hosts; nothing in these headers uses it.
 inline constexpr BOOL FALSE = 0;
+#endif
+#ifndef TRUE
+/// The `BOOL` 1. Any other number than 0 is true as well.
 inline constexpr BOOL TRUE = 1;
+#endif
 /// The values of `VARIANT_BOOL`.
 inline constexpr VARIANT_BOOL VARIANT_FALSE = 0;
 inline constexpr VARIANT_BOOL VARIANT_TRUE = -1;
@@ -40,18 +53,20 @@ inline constexpr HRESULT E_INVALIDARG = static_cast<HRESULT>(0x80070057U);
 /// A tag that no variant may have.
 inline constexpr HRESULT DISP_E_BADVARTYPE = static_cast<HRESULT>(0x80020008U);
 
-/// Whether a result code tells of success, or of a failure.
+/// Whether a result code means success.
 constexpr bool SUCCEEDED(HRESULT result)
 {
     return result >= 0;
 }
+/// Whether a result code means a failure.
 constexpr bool FAILED(HRESULT result)
 {
     return result < 0;
 }
 
-/// The text of a variant: wide characters behind a length of four bytes, zero-terminated. Made by
-/// `SysAllocString`, released by `SysFreeString`; a null pointer is an absent text.
+/// The text of a variant: zero-terminated wide characters after a length of four bytes. Allocate it
+/// with `SysAllocString` or `SysAllocStringLen`, release it with `SysFreeString`. A null pointer is
+/// an absent text.
 using BSTR = wchar_t*;
 
 /// Type tags of a variant. `VT_BYREF` marks a pointer to a value that the variant does not own.
@@ -83,13 +98,13 @@ enum VARENUM : VARTYPE
 /// A value with its type tag. A plain structure: it releases nothing by itself.
 struct VARIANT
 {
-    /// One of `VARENUM`; it tells which member of the union holds the value.
+    /// One of `VARENUM`; it says which member of the union holds the value.
     VARTYPE vt;
-    /// Nothing; room as elsewhere.
+    /// Not used.
     std::uint16_t wReserved1;
     std::uint16_t wReserved2;
     std::uint16_t wReserved3;
-    /// The value; its members go with the tags.
+    /// The value; each member belongs to one tag or a few.
     union
     {
         double dblVal;
@@ -105,6 +120,8 @@ struct VARIANT
         std::int32_t intVal;
         std::uint32_t uintVal;
         VARIANT_BOOL boolVal;
+        CY cyVal;
+        DATE date;
         std::int32_t scode;
         BSTR bstrVal;
         void* byref;
@@ -115,21 +132,23 @@ static_assert(sizeof(VARIANT) == 16);
 /// Makes `variant` empty without looking at what it held.
 DCM_API void VariantInit(VARIANT* variant) noexcept;
 
-/// Releases the content of `variant` and makes it empty. A tag that is none of the above is
-/// answered with `DISP_E_BADVARTYPE` and left alone.
+/// Releases the content of `variant` and makes it empty. Returns 0, or `DISP_E_BADVARTYPE` for a
+/// tag that is none of the above; the variant is then left alone.
 DCM_API HRESULT VariantClear(VARIANT* variant) noexcept;
 
-/// Clears `target` and gives it a copy of `source`, with a text of its own. On a failure
-/// (`E_OUTOFMEMORY`, `DISP_E_BADVARTYPE`) the target is empty, or as clearing it left it.
+/// Clears `target` and copies `source` into it, with a text of its own. Returns 0,
+/// `DISP_E_BADVARTYPE` for a tag of either that is none of the above (the target is left alone), or
+/// `E_OUTOFMEMORY` (the target is empty).
 DCM_API HRESULT VariantCopy(VARIANT* target, const VARIANT* source) noexcept;
 
 /// A new copy of a zero-terminated text; null when `text` is null or memory runs out.
 DCM_API BSTR SysAllocString(const wchar_t* text) noexcept;
 
-/// A new text of `length` characters, copied from `text` unless that is null.
+/// A new text of `length` characters: a copy of those at `text`, or not set when `text` is null.
+/// Returns null when memory runs out.
 DCM_API BSTR SysAllocStringLen(const wchar_t* text, UINT length) noexcept;
 
-/// Releases a text; null is allowed.
+/// Releases a text; does nothing for null.
 DCM_API void SysFreeString(BSTR text) noexcept;
 
 /// The length of a text in characters, 0 for null.
