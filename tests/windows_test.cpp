@@ -1,3 +1,10 @@
+#include "dcm/platform/automation.h"
+
+// Other headers of the system find no choice of the library's.
+#if defined(WIN32_LEAN_AND_MEAN) || defined(NOMINMAX)
+#error "The library's header leaves macros behind."
+#endif
+
 #include "tests/support.h"
 
 #include <gtest/gtest.h>

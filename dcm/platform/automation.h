@@ -1,7 +1,7 @@
 #pragma once
 
-// Result codes, variants and their texts: the system's own on Windows, the same names with the
-// same meaning elsewhere.
+// Result codes, variants and their texts: on Windows the system's own, elsewhere the same names
+// with the same meaning.
 #ifdef _WIN32
 #include "dcm/platform/windows/automation.h"
 #else

@@ -6,15 +6,15 @@
 #include <exception>
 
 /// @file
-/// Failures that are raised.
+/// Failures that are thrown.
 
 namespace dcm {
 
-/// A failure that a result code names, raised where a call cannot return it.
+/// A failure with a result code, thrown by calls that cannot return the code.
 class DCM_API ResultError : public std::exception
 {
 public:
-    /// For `code`, which must be negative.
+    /// `code` must be negative.
     explicit ResultError(HRESULT code) noexcept : m_code(code) {}
     /// The same failure.
     ResultError(const ResultError&) noexcept = default;
@@ -23,13 +23,15 @@ public:
 
     /// The result code, always negative.
     HRESULT Code() const noexcept { return m_code; }
+    /// The failure in words.
     const char* what() const noexcept override;
 
 private:
     HRESULT m_code;
 };
 
-/// Raises `std::bad_alloc` for `E_OUTOFMEMORY`, otherwise a `ResultError` with `code`.
+/// Throws `std::bad_alloc` for `E_OUTOFMEMORY`, otherwise a `ResultError` with `code`, which must
+/// be negative.
 [[noreturn]] DCM_API void ThrowResult(HRESULT code);
 
 } // namespace dcm

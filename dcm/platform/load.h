@@ -1,13 +1,13 @@
 #pragma once
 
-/// The system's calls at load and unload of the library. `platform/` makes them, the library
-/// defines them.
+/// What `platform/` calls when the system loads and unloads the library; defined in `library/`.
 namespace dcm {
 
-/// The library has been loaded as `module` (the system's handle, may be null). False refuses it.
+/// The library has been loaded as `module`, the system's handle, which may be null. Returns false
+/// when the library cannot be used.
 bool OnLibraryLoad(void* module) noexcept;
 
-/// The library is about to be unloaded.
+/// The library will be unloaded next.
 void OnLibraryUnload() noexcept;
 
 } // namespace dcm

@@ -9,10 +9,10 @@ CDynLinkLibrary* lastRegistered = nullptr;
 BOOL AfxInitExtensionModule(AFX_EXTENSION_MODULE& state, void* module) noexcept
 {
     if (state.bInitialized)
-        return FALSE;
-    state.bInitialized = TRUE;
+        return 0;
+    state.bInitialized = 1;
     state.hModule = module;
-    return TRUE;
+    return 1;
 }
 
 void AfxTermExtensionModule(AFX_EXTENSION_MODULE& state) noexcept

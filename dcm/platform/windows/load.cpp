@@ -2,7 +2,7 @@
 
 #include <windows.h>
 
-/// Called by the system when a process loads the DLL and when it unloads it.
+/// The system calls this when a process loads or unloads the DLL.
 extern "C" BOOL WINAPI DllMain(HINSTANCE module, DWORD reason, void* /*reserved*/)
 {
     switch (reason) {
