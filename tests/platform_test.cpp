@@ -3,12 +3,32 @@
 
 #include <gtest/gtest.h>
 
+#include <climits>
+#include <concepts>
 #include <cstdint>
+#include <iomanip>
 #include <limits>
 #include <new>
 #include <thread>
+#include <tuple>
 
 using namespace test;
+
+namespace {
+
+template <class A, class B>
+concept Adds = requires(const A& a, const B& b)
+{
+    a + b;
+};
+
+template <class A, class B>
+concept Appends = requires(A& a, const B& b)
+{
+    a += b;
+};
+
+} // namespace
 
 TEST(Text, SharesItsCharactersUntilOneCopyChanges)
 {
@@ -50,6 +70,85 @@ TEST(Text, ComparesAndRefusesWhatIsOutside)
     const wchar_t* const noText = nullptr;
     const char* const noBytes = nullptr;
     EXPECT_EQ(text + CString(noText) + CString("\xB5") + CString(noBytes), L"ab\u00B5");
+}
+
+TEST(Text, FindsAndCuts)
+{
+    const CString text(L"abcabc");
+    const std::pair<int, int> found[] = {
+        {text.Find(L"bc"), 1},          {text.Find(L"bc", 2), 4},      {text.Find(L"bc", 5), -1},
+        {text.Find(L"bc", -1), -1},     {text.Find(L"", 6), 6},        {text.Find(L"", 7), -1},
+        {text.Find(L'c'), 2},           {text.Find(L'c', 3), 5},       {text.Find(L'c', 6), -1},
+        {text.Find(L'a', -1), -1},      {text.Find(L'x'), -1},         {text.FindOneOf(L"xcb"), 1},
+        {text.FindOneOf(L"xyz"), -1},   {text.FindOneOf(L""), -1},     {CString().Find(L'a'), -1},
+        {text.Find(L'b', INT_MAX), -1}, {text.Find(CString(L"ca")), 2}};
+    for (std::size_t i = 0; i < std::size(found); ++i)
+        EXPECT_EQ(found[i].first, found[i].second) << i;
+    const std::pair<CString, const wchar_t*> cut[] = {{text.Left(2), L"ab"},
+                                                      {text.Left(-1), L""},
+                                                      {text.Left(7), L"abcabc"},
+                                                      {text.Right(2), L"bc"},
+                                                      {text.Right(-1), L""},
+                                                      {text.Right(7), L"abcabc"},
+                                                      {text.Mid(4), L"bc"},
+                                                      {text.Mid(-1), L"abcabc"},
+                                                      {text.Mid(7), L""},
+                                                      {text.Mid(1, 2), L"bc"},
+                                                      {text.Mid(-1, 2), L"ab"},
+                                                      {text.Mid(6, 1), L""},
+                                                      {text.Mid(2, INT_MAX), L"cabc"},
+                                                      {text.Mid(1, INT_MIN), L""}};
+    for (const auto& [part, expected] : cut)
+        EXPECT_EQ(part, expected);
+}
+
+TEST(Text, TrimsAndReplaces)
+{
+    const CString text(L"\t\n\v\f\r a b\u00A0 \r\n");
+    EXPECT_EQ(CString(text).Trim(), L"a b\u00A0");
+    EXPECT_EQ(CString(text).TrimLeft(), L"a b\u00A0 \r\n");
+    EXPECT_EQ(CString(text).TrimRight(), L"\t\n\v\f\r a b\u00A0");
+    EXPECT_EQ(CString(L" \r\n").Trim(), L"");
+    EXPECT_EQ(CString(L"\"'x' \"").Trim(L"'\""), L"x' ");
+    EXPECT_EQ(CString(L"aabaa").TrimLeft(L"a").TrimRight(L"b"), L"baa");
+    EXPECT_EQ(CString(L" a ").Trim(L""), L" a ");
+    const std::tuple<const wchar_t*, const wchar_t*, int, const wchar_t*> cases[] = {
+        {L"ab", L"x", 2, L"xaxa"}, {L"a", L"aa", 4, L"aabaaaabaa"}, {L"", L"x", 0, L"abaaba"},
+        {L"abaaba", L"", 1, L""},  {L"c", L"x", 0, L"abaaba"},      {L"aba", L"ab", 2, L"abab"}};
+    for (const auto& [from, to, count, expected] : cases) {
+        const CString whole(L"abaaba");
+        CString changed(whole);
+        EXPECT_EQ(changed.Replace(from, to), count);
+        EXPECT_EQ(changed, expected);
+        EXPECT_EQ(whole, L"abaaba");
+    }
+    CString own(L"ab");
+    EXPECT_EQ(own.Replace(own.View().substr(1), own), 1);
+    EXPECT_EQ(own.Replace(L'a', L'c'), 2);
+    EXPECT_EQ(own, L"ccb");
+}
+
+TEST(Text, TakesCharacters)
+{
+    const CString name(L"Name");
+    CString text = L'<' + name + L'_' + L'\0';
+    text += L'>';
+    text.AppendChar(L'!');
+    EXPECT_EQ(text.View(), std::wstring_view(L"<Name_\0>!", 9));
+    const CString copy(text);
+    text.SetAt(0, L'(');
+    text.SetAt(8, L'?');
+    EXPECT_EQ(text.Left(5) + text.Right(2) + copy.Left(1), L"(Name>?<");
+    EXPECT_THROW(text.SetAt(9, L'x'), dcm::ResultError);
+    EXPECT_THROW(text.SetAt(-1, L'x'), dcm::ResultError);
+    EXPECT_TRUE(name.Left(1) == L'N' && L'N' == name.Left(1) && name != L'N' && name > L'N');
+    EXPECT_TRUE(L'O' > name && CString() < L'\0' && CString() != L'\0');
+    std::wostringstream out;
+    out << std::setw(5) << name << L'|' << name + L'_';
+    EXPECT_EQ(out.str(), L" Name|Name_");
+    // Any other number is no character.
+    EXPECT_FALSE((Adds<CString, char> || Adds<CString, int> || Adds<char, CString>));
+    EXPECT_FALSE((std::equality_comparable_with<CString, int> || Appends<CString, char>));
 }
 
 // A constant cannot read another member than the one that was set.
