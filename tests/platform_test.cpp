@@ -225,16 +225,16 @@ TEST(CodePages, ConvertAsTheirCasesSay)
     EXPECT_GT(rows.size(), 20U);
     for (const auto& row : rows) {
         SCOPED_TRACE(testing::PrintToString(row));
-        if (row[0] == "linux" && std::filesystem::path::preferred_separator != '/')
+        if (row[0].starts_with("linux") && std::filesystem::path::preferred_separator != '/')
             continue;
         EXPECT_TRUE(dcm::SetThreadCodePage(static_cast<unsigned>(std::stoul(row[1]))));
         std::string bytes;
         for (std::size_t i = 0; i < row[3].size(); i += 2)
             bytes += static_cast<char>(std::stoi(row[3].substr(i, 2), nullptr, 16));
-        if (row[0] != "write") {
+        if (!row[0].ends_with("write")) {
             EXPECT_EQ(dcm::Widen(bytes), dcm::FromUtf8(row[2]));
         }
-        if (row[0] != "read") {
+        if (!row[0].ends_with("read")) {
             EXPECT_EQ(Narrow(dcm::FromUtf8(row[2])), bytes);
         }
     }

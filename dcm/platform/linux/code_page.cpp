@@ -50,31 +50,64 @@ public:
     // NOLINTNEXTLINE(performance-no-int-to-ptr): how the C library marks a failure.
     bool IsOpen() const { return m_handle != reinterpret_cast<iconv_t>(-1); }
 
-    /// Converts all of `text`; what cannot be converted becomes `substitute`, character by
-    /// character in UTF-8, otherwise byte by byte.
-    std::string Convert(std::string_view text, std::string_view substitute, bool isUtf8)
+    /// Converts all of `text` from UTF-8; a character that the page lacks becomes `?`.
+    std::string FromUtf8(std::string_view text)
     {
-        std::string result;
-        // The C library takes the input as not constant but does not write to it.
-        char* in = const_cast<char*>(text.data());
-        std::size_t left = text.size();
-        while (left > 0) {
-            if (Step(&in, &left, result))
-                continue;
-            result += substitute;
+        return Convert(text, [](std::string_view& rest, std::string& result, Conversion& page) {
             do {
-                ++in;
-                --left;
-            } while (isUtf8 && left > 0 && (static_cast<unsigned char>(*in) & 0xC0U) == 0x80);
-        }
-        // A page with shift states ends in its first state.
-        Step(nullptr, nullptr, result);
-        return result;
+                rest.remove_prefix(1);
+            } while (!rest.empty() && (static_cast<unsigned char>(rest[0]) & 0xC0U) == 0x80);
+            // By the same conversion, which knows whether the page has to change its shift state.
+            std::string_view substitute = "?";
+            while (!substitute.empty() && page.Step(substitute, result)) {
+            }
+        });
+    }
+
+    /// Converts all of `text` to UTF-8; a byte that is no character becomes U+FFFD. `holdsLetters`
+    /// says that the page holds a letter back until it knows whether marks for it follow.
+    std::string ToUtf8(std::string_view text, bool holdsLetters)
+    {
+        return Convert(text, [=](std::string_view& rest, std::string& result, Conversion& page) {
+            if (holdsLetters)
+                page.Finish(result);
+            rest.remove_prefix(1);
+            result += "\xEF\xBF\xBD";
+        });
     }
 
 private:
-    /// Converts as much as fits into one piece. Returns false at a unit that cannot be converted.
-    bool Step(char** in, std::size_t* left, std::string& result)
+    /// Converts all of `text`; `substitute` replaces what cannot be converted at the start of the
+    /// rest.
+    template <class Substitute>
+    std::string Convert(std::string_view text, Substitute substitute)
+    {
+        std::string result;
+        while (!text.empty()) {
+            if (!Step(text, result))
+                substitute(text, result, *this);
+        }
+        // A page with shift states ends in its first state.
+        Finish(result);
+        return result;
+    }
+
+    /// Converts as much of `text` as fits into one piece and takes it off. Returns false at a unit
+    /// that cannot be converted.
+    bool Step(std::string_view& text, std::string& result)
+    {
+        // The C library takes the input as not constant but does not write to it.
+        char* in = const_cast<char*>(text.data());
+        std::size_t left = text.size();
+        const bool converted = Call(&in, &left, result);
+        text.remove_prefix(text.size() - left);
+        return converted;
+    }
+
+    /// Writes what the conversion holds back and returns it to its first state.
+    void Finish(std::string& result) { Call(nullptr, nullptr, result); }
+
+    bool Call(char** in, std::size_t* left, std::string& result)
     {
         if (!IsOpen())
             ThrowResult(E_OUTOFMEMORY);
@@ -107,14 +140,14 @@ bool KnowsCodePage(unsigned identifier)
 
 std::string CodePageToUtf8(unsigned identifier, std::string_view bytes)
 {
-    return Conversion(kUtf8, NameOf(identifier)).Convert(bytes, "\xEF\xBF\xBD", false);
+    // Hebrew and Vietnamese, whose letters are joined with the marks after them.
+    const bool holdsLetters = identifier == 1255 || identifier == 1258;
+    return Conversion(kUtf8, NameOf(identifier)).ToUtf8(bytes, holdsLetters);
 }
 
 std::string Utf8ToCodePage(unsigned identifier, std::string_view utf8)
 {
-    const std::string name = NameOf(identifier);
-    const std::string substitute = Conversion(name, kUtf8).Convert("?", "?", true);
-    return Conversion(name, kUtf8).Convert(utf8, substitute, true);
+    return Conversion(NameOf(identifier), kUtf8).FromUtf8(utf8);
 }
 
 } // namespace dcm::system
