@@ -35,6 +35,9 @@ struct Fault
 
 Fault fault;
 int calls = 0;
+
+/// How often the system was told how memory will be used.
+int advices = 0;
 /// Whether `write` reports success without writing.
 bool writesNothing = false;
 
@@ -81,6 +84,13 @@ ssize_t __wrap_write(int file, const void* from, std::size_t count)
     const ssize_t room = Room("write", count);
     return room < 0 || writesNothing ? room
                                      : __real_write(file, from, static_cast<std::size_t>(room));
+}
+
+int __real_madvise(void* memory, std::size_t size, int advice);
+int __wrap_madvise(void* memory, std::size_t size, int advice)
+{
+    ++advices;
+    return __real_madvise(memory, size, advice);
 }
 
 int __real_close(int file);
@@ -353,6 +363,20 @@ TEST(LinuxFile, IsNotInheritedAndMayHaveAnyHandle)
     EXPECT_EQ(fcntl(STDIN_FILENO, F_GETFD), -1);
     dup2(input, STDIN_FILENO);
     close(input);
+}
+
+TEST(LinuxFile, AsksForLargePagesOnlyInMemoryOfItsOwn)
+{
+    const Folder folder;
+    const CString path = folder / L"a";
+    WriteBytes(path, "\n");
+    // The C library takes small pieces from the heap, which the host goes on using.
+    for (const auto& [size, advised] : {std::pair(100'000, 0), {8 << 20, 0}, {64 << 20, 1}}) {
+        std::filesystem::resize_file(PathOf(path), static_cast<std::uintmax_t>(size));
+        advices = 0;
+        PravFile(path, kRead);
+        EXPECT_EQ(advices, advised) << size;
+    }
 }
 
 TEST(LinuxFile, ReportsAFullDevice)

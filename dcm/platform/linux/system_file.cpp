@@ -128,6 +128,12 @@ long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size
 
 void ExpectToFill(void* memory, std::size_t size) noexcept
 {
+    // From this size on the C library takes memory from the system for each piece alone and returns
+    // it when the piece is released. Smaller pieces may be parts of the heap that the host goes on
+    // using.
+    constexpr std::size_t ownMemory = std::size_t{32} << 20;
+    if (size < ownMemory)
+        return;
     // The whole pages in it.
     const auto page = static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
     if (std::align(page, page, memory, size) != nullptr)
