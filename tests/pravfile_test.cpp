@@ -76,6 +76,29 @@ TEST(TextFile, OpensAnewWithOrWithoutSuccess)
     EXPECT_THROW(file.WriteText(L"a"), CFileException);
 }
 
+TEST(TextFile, IsClosedAfterAFailureToLoad)
+{
+    struct GrownFile : PravFile
+    {
+        BOOL GetStatus(CFileStatus& status) const override
+        {
+            status.m_size = 1ULL << 31;
+            return TRUE;
+        }
+    } file;
+    const Folder folder;
+    const CString path = folder / L"a";
+    WriteBytes(path, "a\n");
+    try {
+        file.Open(path, kRead);
+        ADD_FAILURE() << "a file of 2 GiB";
+    } catch (const CFileException& error) {
+        EXPECT_EQ(error.m_cause, CFileException::fileTooLarge);
+        EXPECT_EQ(error.m_strFileName, path);
+    }
+    EXPECT_EQ(CauseOf(path, kRead), CFileException::none) << "it is not locked any more";
+}
+
 TEST(TextFile, ConvertsLongTextWhole)
 {
     const Folder folder;

@@ -110,6 +110,10 @@ public:
     /// could not store all of the file, which is closed all the same.
     virtual void Close();
 
+protected:
+    /// The path as it was given.
+    const CString& FilePath() const { return m_strFileName; }
+
 private:
     [[noreturn]] void Throw(long osError) const;
     long CloseHandle() noexcept;

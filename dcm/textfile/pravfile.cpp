@@ -57,7 +57,17 @@ BOOL PravFile::Open(const wchar_t* path, UINT flags, CFileException* error)
 {
     m_pContent.reset();
     const BOOL opened = CFile::Open(path, flags, error);
-    LoadContent(flags);
+    try {
+        LoadContent(flags);
+    } catch (...) {
+        // Without its text the file is of no use, and while it is open nobody else can open it.
+        try {
+            Close();
+        } catch (const CFileException&) {
+            // The file is closed all the same; the failure to load it is what the host is told.
+        }
+        throw;
+    }
     return opened;
 }
 
@@ -68,7 +78,7 @@ void PravFile::LoadContent(UINT flags)
     if ((flags & modeWrite) != 0 || !GetStatus(status))
         return;
     if (status.m_size > kSizeMax)
-        throw CFileException(CFileException::fileTooLarge, 0, CString());
+        throw CFileException(CFileException::fileTooLarge, 0, FilePath());
     auto content = std::make_unique<Content>();
     dcm::TextBuffer bytes(status.m_size);
     dcm::system::ExpectToFill(bytes.Data(), status.m_size);
@@ -76,7 +86,7 @@ void PravFile::LoadContent(UINT flags)
     content->m_strContent = dcm::FileText::OfFile(std::move(bytes));
     // A conversion to UTF-8 may lengthen the text.
     if (content->m_strContent.Bytes().size() > kSizeMax)
-        throw CFileException(CFileException::fileTooLarge, 0, CString());
+        throw CFileException(CFileException::fileTooLarge, 0, FilePath());
     m_pContent = std::move(content);
 }
 
