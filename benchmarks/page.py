@@ -14,7 +14,7 @@ import browser  # noqa: E402
 
 PAGE = pathlib.Path("docs/performance.md")
 DATA = "build/bench/benchmarks/dcm_make_data"
-COMMAND = ["build/release/tools/report/report_page"]
+COMMAND = ["build/program/tools/dcm", "report"]
 FIRST = "e43d885"  # the last commit with the page of the first version
 BLOCKS = 5000
 WORDS = "ZndWnkl"  # typed letter by letter; a part of names
@@ -60,8 +60,8 @@ def first_version(folder):
             source = subprocess.run(["git", "show", f"{FIRST}:{name}"], check=True,
                                     stdout=subprocess.PIPE, stderr=subprocess.DEVNULL).stdout
             (folder / name).write_bytes(source)
-        library = pathlib.Path("build/release/dcm").resolve()
-        subprocess.run(["c++", "-std=c++20", "-O2", f"-I{folder}", "-I.", "-Ibuild/release/include",
+        library = pathlib.Path("build/program/dcm").resolve()
+        subprocess.run(["c++", "-std=c++20", "-O2", f"-I{folder}", "-I.", "-Ibuild/program/include",
                         folder / "examples/report.cpp", "-o", folder / "report", f"-L{library}",
                         "-ldcm", f"-Wl,-rpath,{library}"], check=True)
         return folder / "report"

@@ -1,4 +1,4 @@
-# Debian packages by CPack: libdcm1 to run hosts, libdcm-dev to build them. scripts/package builds and
+# Debian packages by CPack: libdcm1 to run hosts, libdcm-dev to build them, dcm-tools with the program. scripts/package builds and
 # checks them.
 set(DCM_DEBIAN_REVISION 1 CACHE STRING "Revision of the Debian packages")
 set(DCM_DEBIAN_MAINTAINER "The dcm project <dcm@dcm.invalid>" CACHE STRING
@@ -10,7 +10,7 @@ set(CPACK_GENERATOR DEB)
 set(CPACK_PACKAGE_NAME dcm)
 set(CPACK_PACKAGE_VERSION ${PROJECT_VERSION})
 set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
-set(CPACK_COMPONENTS_ALL Runtime Development)
+set(CPACK_COMPONENTS_ALL Runtime Development Tools)
 set(CPACK_DEB_COMPONENT_INSTALL ON)
 set(CPACK_STRIP_FILES ON)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
@@ -43,6 +43,15 @@ CMake package and the pkg-config file.")
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_DEPENDS
     "${runtime} (= ${PROJECT_VERSION}-${DCM_DEBIAN_REVISION})")
 
+set(CPACK_DEBIAN_TOOLS_PACKAGE_NAME dcm-tools)
+set(CPACK_DEBIAN_TOOLS_PACKAGE_SECTION utils)
+set(CPACK_COMPONENT_TOOLS_DESCRIPTION "${text} the program dcm, which shows, checks, compares,
+merges and converts such files.")
+# The library is found where it was built, which tells nothing of its package.
+set(CPACK_DEBIAN_TOOLS_PACKAGE_SHLIBDEPS ON)
+set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS ${PROJECT_BINARY_DIR}/dcm)
+set(CPACK_DEBIAN_TOOLS_PACKAGE_DEPENDS "${runtime} (>= ${PROJECT_VERSION})")
+
 # The documents that every Debian package has.
 string(TIMESTAMP DCM_DEBIAN_DATE "%a, %d %b %Y %H:%M:%S +0000" UTC)
 set(documents ${PROJECT_BINARY_DIR}/debian)
@@ -57,7 +66,7 @@ string(REGEX REPLACE "^.*\n(Permission is .*)\n$" "\\1" license "${license}")
 string(REPLACE "\n\n" "\n.\n" license "${license}")
 string(REPLACE "\n" "\n " license " ${license}")
 configure_file(cmake/debian/copyright.in ${documents}/copyright @ONLY)
-foreach(component Runtime Development)
+foreach(component Runtime Development Tools)
     string(TOUPPER ${component} name)
     install(FILES ${documents}/changelog.gz ${documents}/changelog.Debian.gz
             ${documents}/copyright
