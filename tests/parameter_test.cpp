@@ -66,6 +66,7 @@ void ExpectThereAndBack(const DCMConverter& document)
     EXPECT_EQ(WithoutDistributions(bytes).second, expected);
     EXPECT_EQ(ExportBytes(moved), bytes);
     EXPECT_EQ(ExportBytes(taken), bytes);
+    EXPECT_TRUE(dcm::Differences(parameters, dcm::ParametersOf(copied)).empty());
 }
 
 } // namespace
@@ -174,6 +175,20 @@ TEST(Parameter, OfADocumentMadeByHandComesBackAsTheSameBytes)
     }
 }
 
+TEST(Parameter, HasTheKindThatItsBlockWrites)
+{
+    // A list holds what was added to it, under the keyword that each block brought along.
+    DCMConverter document;
+    document.AddFestwert(DCMTextstring());
+    document.AddKennlinie(DCMGruppenkennlinie());
+    document.AddKennfeld(DCMFestkennfeld());
+    std::vector<Kind> kinds;
+    for (const Parameter& parameter : dcm::ParametersOf(document))
+        kinds.push_back(parameter.kind);
+    EXPECT_EQ(kinds,
+              (std::vector{Kind::kTextstring, Kind::kGruppenkennlinie, Kind::kFestkennfeld}));
+}
+
 TEST(Parameter, MadeByAHostIsWritten)
 {
     // Integers, as a host writes them down, are numbers; text and number do not mix in an array.
@@ -212,6 +227,8 @@ TEST(ForEach, VisitsTheBlocksInTheOrderOfExport)
     for (const Parameter& parameter : dcm::ParametersOf(document))
         expected += Show(parameter.name) + "\n";
     EXPECT_EQ(names, expected);
+    // The blocks are the document's own: they are there the second time.
+    dcm::ForEach(document, [&](const auto& block) { EXPECT_EQ(blocks.erase(&block), 1U); });
 
     struct Maps : dcm::BlockVisitor
     {

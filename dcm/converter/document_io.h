@@ -4,6 +4,8 @@
 #include "dcm/platform/cstring.h"
 #include "dcm/textfile/findings.h"
 
+#include <tuple>
+
 /// Import and export of a document with what hosts do not see: how far they came, and why they
 /// failed.
 namespace dcm {
@@ -23,6 +25,17 @@ struct DocumentIo
     /// The kinds of blocks, in the order in which they are exported.
     struct Kind;
     static const Kind kKinds[];
+
+    /// The lists of blocks of a document, constant or not, in the order in which they are exported.
+    template <class Document>
+    static auto Lists(Document& document)
+    {
+        return std::tie(document.m_listFestwerte, document.m_listFestwerteblock,
+                        document.m_listStuetzstellenverteilung, document.m_listKennlinie,
+                        document.m_listFestkennlinie, document.m_listGruppenkennlinie,
+                        document.m_listKennfeld, document.m_listFestkennfeld,
+                        document.m_listGruppenkennfeld, document.m_listTextstring);
+    }
 
     /// What the document's Import does; failures are raised. `stage` tells how far it came.
     /// Nothing is reported when `findings` is null.

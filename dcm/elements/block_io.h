@@ -14,6 +14,11 @@ class PravFile;
 
 namespace dcm {
 
+struct CurveFields;
+struct DistributionFields;
+struct ListFields;
+struct MapFields;
+struct ValueFields;
 class FileBlock;
 class FileText;
 class FileTextBuilder;
@@ -49,6 +54,13 @@ struct BlockIo
                               std::string_view function, const FileText& text, DCMBaseType& block);
     /// Appends the lines of LANGNAME, DISPLAYNAME and FUNKTION.
     static void ComposeAttributes(const DCMBaseType& block, FileTextBuilder& text);
+
+    /// The fields that are moved out of a block or into it.
+    static ValueFields FieldsOf(DCMFestwert& block);
+    static ListFields FieldsOf(DCMFestwerteblock& block);
+    static DistributionFields FieldsOf(DCMStuetzstellenverteilung& block);
+    static CurveFields FieldsOf(DCMKennlinie& block);
+    static MapFields FieldsOf(DCMKennfeld& block);
 };
 
 } // namespace dcm

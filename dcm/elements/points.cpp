@@ -27,6 +27,18 @@ bool KeepsValue(VARTYPE type)
     return type == VT_R8 || type == VT_R4 || type == VT_BSTR;
 }
 
+/// The type of an array of this type that the point is added to. The point loses its value if it
+/// has none there.
+VARTYPE JoinType(VARTYPE type, CComVariant& point)
+{
+    type = TypeWith(type, point.vt);
+    if (!KeepsValue(type)) {
+        point = CComVariant();
+        point.vt = type;
+    }
+    return type;
+}
+
 void ReadNumbers(std::string_view rest, const PointArray& array)
 {
     NumberReader numbers(rest);
@@ -70,13 +82,16 @@ void AppendPoint(const PointArray& array, const VARIANT& point)
 
 void AppendPoint(const PointArray& array, CComVariant&& point)
 {
-    const VARTYPE type = TypeWith(array.type, point.vt);
-    if (!KeepsValue(type)) {
-        point = CComVariant();
-        point.vt = type;
-    }
+    const VARTYPE type = JoinType(array.type, point);
     array.points.push_back(std::move(point));
     array.type = type;
+}
+
+void SetTypeOfPoints(const PointArray& array)
+{
+    array.type = VT_EMPTY;
+    for (CComVariant& point : array.points)
+        array.type = JoinType(array.type, point);
 }
 
 void ReservePoints(std::initializer_list<AnnouncedPoints> arrays, const FileBlock& block)

@@ -31,6 +31,10 @@ void AppendPoint(const PointArray& array, const VARIANT& point);
 /// The same with a point whose text becomes the array's own.
 void AppendPoint(const PointArray& array, CComVariant&& point);
 
+/// Gives the array, whose points have been replaced, the type that appending them would have given
+/// it, and takes the value away from the points that have none then.
+void SetTypeOfPoints(const PointArray& array);
+
 /// An array of points and how many of them a block announces.
 struct AnnouncedPoints
 {

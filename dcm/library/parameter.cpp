@@ -1,11 +1,17 @@
 #include "dcm/library/parameter.h"
 
 #include "dcm/converter/dcmconverter.h"
+#include "dcm/converter/document_io.h"
+#include "dcm/elements/block_fields.h"
+#include "dcm/elements/block_io.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/variant_number.h"
 #include "dcm/platform/text.h"
 
 #include <algorithm>
+#include <initializer_list>
+#include <list>
+#include <tuple>
 #include <utility>
 
 namespace dcm {
@@ -22,123 +28,219 @@ constexpr std::array<std::wstring_view, kKinds.size()> kKeywords = {
 
 constexpr std::wstring_view kCommentMark = L"* ";
 
-template <class Block>
-Parameter Named(Kind kind, const Block& block)
+Parameter TakeTexts(Kind kind, DCMBaseType& block)
 {
     Parameter parameter;
     parameter.kind = kind;
-    parameter.name = block.GetName();
-    parameter.langname = block.GetLangname();
-    parameter.displayname = block.GetDisplayname();
-    parameter.function = block.GetFunction();
+    parameter.name = std::move(block.GetName());
+    parameter.langname = std::move(block.GetLangname());
+    parameter.displayname = std::move(block.GetDisplayname());
+    parameter.function = std::move(block.GetFunction());
+    return parameter;
+}
+
+void PutTexts(Parameter& parameter, DCMBaseType& block)
+{
+    block.GetName() = std::move(parameter.name);
+    block.GetLangname() = std::move(parameter.langname);
+    block.GetDisplayname() = std::move(parameter.displayname);
+    block.GetFunction() = std::move(parameter.function);
+}
+
+/// The one of a family's kinds that the block writes; the first when a host's class has a keyword
+/// of its own.
+Kind KindOf(const CString& keyword, std::initializer_list<Kind> family)
+{
+    const auto* const kind =
+        std::ranges::find_if(family, [&](Kind k) { return keyword == KeywordOf(k); });
+    return kind == family.end() ? *family.begin() : *kind;
+}
+
+/// What a parameter holds of a value: the number that it stands for, a text, or nothing.
+void MakePlain(CComVariant& value)
+{
+    if (value.vt == VT_R8 || value.vt == VT_BSTR)
+        return;
+    const std::optional<double> number = NumberOf(value);
+    value = number ? CComVariant(*number) : CComVariant();
+}
+
+/// Takes the points, without the value of those that the block does not write.
+std::vector<CComVariant> TakePoints(const PointArray& array)
+{
+    // Before the first point of the type there are only empty ones.
+    if (array.type != VT_R8 && array.type != VT_BSTR) {
+        for (CComVariant& point : array.points) {
+            if (point.vt != VT_R8 && point.vt != VT_BSTR)
+                point = CComVariant();
+        }
+    }
+    return std::move(array.points);
+}
+
+void PutPoints(std::vector<CComVariant>& points, const PointArray& array)
+{
+    std::ranges::for_each(points, MakePlain);
+    array.points = std::move(points);
+    SetTypeOfPoints(array);
+}
+
+Axis TakeAxis(CString& unit, const AxisFields& axis)
+{
+    return {std::move(unit), std::move(axis.written.IsEmpty() ? axis.read : axis.written),
+            TakePoints(axis.points)};
+}
+
+void PutAxis(Axis& axis, CString& unit, const AxisFields& fields)
+{
+    unit = std::move(axis.unit);
+    fields.written = std::move(axis.distribution);
+    PutPoints(axis.points, fields.points);
+}
+
+// ---- Parameters of blocks that lose their content -----------------------------------------------
+
+Parameter Take(DCMFestwert& block)
+{
+    const ValueFields fields = BlockIo::FieldsOf(block);
+    Parameter parameter =
+        TakeTexts(KindOf(fields.keyword, {Kind::kFestwert, Kind::kTextstring}), block);
+    parameter.unit = std::move(block.GetUnit());
+    MakePlain(fields.value);
+    if (fields.value.vt != VT_EMPTY)
+        parameter.values.push_back(std::move(fields.value));
+    parameter.columns = parameter.values.size();
+    return parameter;
+}
+
+Parameter Take(DCMFestwerteblock& block)
+{
+    const ListFields fields = BlockIo::FieldsOf(block);
+    Parameter parameter = TakeTexts(Kind::kFestwerteblock, block);
+    parameter.unit = std::move(block.GetUnit());
+    parameter.countX = block.GetXValueCount();
+    parameter.countY = block.GetYValueCount();
+    parameter.values.reserve(fields.numbers.size() + fields.texts.size());
+    parameter.values.assign(fields.numbers.begin(), fields.numbers.end());
+    parameter.values.insert(parameter.values.end(), fields.texts.begin(), fields.texts.end());
+    const bool hasRows = parameter.countX > 0 && parameter.countY > 0;
+    parameter.columns =
+        hasRows ? static_cast<std::size_t>(parameter.countX) : parameter.values.size();
+    return parameter;
+}
+
+Parameter Take(DCMStuetzstellenverteilung& block)
+{
+    Parameter parameter = TakeTexts(Kind::kStuetzstellenverteilung, block);
+    parameter.x.unit = std::move(block.GetUnit());
+    parameter.x.points = TakePoints(BlockIo::FieldsOf(block).points);
+    return parameter;
+}
+
+Parameter Take(DCMKennlinie& block)
+{
+    const CurveFields fields = BlockIo::FieldsOf(block);
+    Parameter parameter = TakeTexts(
+        KindOf(fields.keyword, {Kind::kKennlinie, Kind::kFestkennlinie, Kind::kGruppenkennlinie}),
+        block);
+    parameter.x = TakeAxis(block.GetUnit_X(), fields.x);
+    parameter.unit = std::move(block.GetUnit_W());
+    parameter.values = TakePoints(fields.values);
+    parameter.countX = block.GetAxisLenghtX();
+    parameter.columns = parameter.values.size();
+    return parameter;
+}
+
+Parameter Take(DCMKennfeld& block)
+{
+    const MapFields fields = BlockIo::FieldsOf(block);
+    Parameter parameter = TakeTexts(
+        KindOf(fields.keyword, {Kind::kKennfeld, Kind::kFestkennfeld, Kind::kGruppenkennfeld}),
+        block);
+    parameter.x = TakeAxis(block.GetUnit_X(), fields.x);
+    parameter.y = TakeAxis(block.GetUnit_Y(), fields.y);
+    parameter.unit = std::move(block.GetUnit_W());
+    parameter.values = TakePoints(fields.values);
+    parameter.countX = block.GetAxisLenghtX();
+    parameter.countY = block.GetAxisLenghtY();
+    parameter.columns = parameter.x.points.size();
     return parameter;
 }
 
 template <class Block>
-Block BlockOf(const Parameter& parameter)
+Parameter TakeCopy(const Block& block)
 {
-    Block block;
-    block.SetName(parameter.name);
-    block.SetLangname(parameter.langname);
-    block.SetDisplayname(parameter.displayname);
-    block.SetFunction(parameter.function);
-    return block;
+    Block copy(block);
+    return Take(copy);
 }
 
-/// What a parameter holds of a value: the number that it stands for, a text, or nothing.
-CComVariant Plain(const CComVariant& value)
+// ---- Blocks of parameters that lose their content -----------------------------------------------
+
+void Put(Parameter& parameter, DCMFestwert& block)
 {
-    if (value.vt == VT_BSTR)
-        return value;
-    const std::optional<double> number = NumberOf(value);
-    return number ? CComVariant(*number) : CComVariant();
+    block.GetUnit() = std::move(parameter.unit);
+    if (parameter.values.empty())
+        return;
+    MakePlain(parameter.values.front());
+    BlockIo::FieldsOf(block).value = std::move(parameter.values.front());
 }
 
-/// Takes the value away from points that the block does not write.
-void DropUnwritten(std::vector<CComVariant>& points)
+void Put(Parameter& parameter, DCMFestwerteblock& block)
 {
-    for (CComVariant& point : points) {
-        if (point.vt != VT_R8 && point.vt != VT_BSTR)
-            point = CComVariant();
-    }
-}
-
-template <class Block>
-void AddDistribution(DCMConverter& document, const Parameter& parameter)
-{
-    auto block = BlockOf<Block>(parameter);
-    block.SetUnit(parameter.x.unit);
-    for (const CComVariant& point : parameter.x.points)
-        block.AddValue(Plain(point));
-    document.AddStuetzstellenverteilung(std::move(block));
-}
-
-template <class Block>
-Block ValueBlock(const Parameter& parameter)
-{
-    auto block = BlockOf<Block>(parameter);
-    block.SetUnit(parameter.unit);
-    if (!parameter.values.empty())
-        block.SetValue(Plain(parameter.values.front()));
-    return block;
-}
-
-DCMFestwerteblock ListBlock(const Parameter& parameter)
-{
-    auto block = BlockOf<DCMFestwerteblock>(parameter);
-    block.SetUnit(parameter.unit);
+    block.GetUnit() = std::move(parameter.unit);
     block.SetXValueCount(parameter.countX);
     block.SetYValueCount(parameter.countY);
+    const ListFields fields = BlockIo::FieldsOf(block);
+    const auto texts = std::ranges::count(parameter.values, VT_BSTR, &CComVariant::vt);
+    fields.numbers.reserve(parameter.values.size() - static_cast<std::size_t>(texts));
     for (const CComVariant& value : parameter.values) {
-        if (value.vt == VT_BSTR) {
-            block.AddValue(CString(CComVariant::TextOf(value)));
-        } else {
-            block.AddValue(NumberOf(value).value_or(0.0));
-        }
+        if (value.vt == VT_BSTR)
+            fields.texts.emplace_back(CComVariant::TextOf(value));
+        else
+            fields.numbers.push_back(NumberOf(value).value_or(0.0));
     }
-    return block;
 }
 
-template <class Block>
-Block Curve(const Parameter& parameter)
+void Put(Parameter& parameter, DCMStuetzstellenverteilung& block)
 {
-    auto block = BlockOf<Block>(parameter);
-    block.SetUnit_X(parameter.x.unit);
-    block.SetUnit_W(parameter.unit);
-    block.SetSharedAxisUniqueName(parameter.x.distribution);
+    block.GetUnit() = std::move(parameter.x.unit);
+    PutPoints(parameter.x.points, BlockIo::FieldsOf(block).points);
+}
+
+void Put(Parameter& parameter, DCMKennlinie& block)
+{
+    const CurveFields fields = BlockIo::FieldsOf(block);
+    PutAxis(parameter.x, block.GetUnit_X(), fields.x);
+    block.GetUnit_W() = std::move(parameter.unit);
+    PutPoints(parameter.values, fields.values);
     block.SetAxisLenghtX(parameter.countX);
-    for (const CComVariant& point : parameter.x.points)
-        block.AddAxis(Plain(point));
-    for (const CComVariant& value : parameter.values)
-        block.AddValue(Plain(value));
-    return block;
 }
 
-template <class Block>
-Block Map(const Parameter& parameter)
+void Put(Parameter& parameter, DCMKennfeld& block)
 {
-    auto block = BlockOf<Block>(parameter);
-    block.SetUnit_X(parameter.x.unit);
-    block.SetUnit_Y(parameter.y.unit);
-    block.SetUnit_W(parameter.unit);
-    block.SetSharedXAxisUniqueName(parameter.x.distribution);
-    block.SetSharedYAxisUniqueName(parameter.y.distribution);
+    const MapFields fields = BlockIo::FieldsOf(block);
+    PutAxis(parameter.x, block.GetUnit_X(), fields.x);
+    PutAxis(parameter.y, block.GetUnit_Y(), fields.y);
+    block.GetUnit_W() = std::move(parameter.unit);
+    PutPoints(parameter.values, fields.values);
     block.SetAxisLenghtX(parameter.countX);
     block.SetAxisLenghtY(parameter.countY);
-    for (const CComVariant& point : parameter.x.points)
-        block.AddAxisX(Plain(point));
-    for (const CComVariant& point : parameter.y.points)
-        block.AddAxisY(Plain(point));
-    for (const CComVariant& value : parameter.values)
-        block.AddValue(Plain(value));
-    return block;
 }
 
-template <class Blocks>
-void VisitAll(const Blocks& blocks, BlockVisitor& visitor)
+/// Appends the parameter as a block when it is complete.
+template <class Block>
+void Append(Parameter& parameter, std::list<Block>& blocks)
 {
-    for (const auto& block : blocks)
-        visitor.Visit(block);
+    std::list<Block> fresh(1);
+    PutTexts(parameter, fresh.front());
+    Put(parameter, fresh.front());
+    blocks.splice(blocks.end(), fresh);
+}
+
+std::size_t CountOfBlocks(const DCMConverter& document)
+{
+    return std::apply([](const auto&... lists) { return (lists.size() + ...); },
+                      DocumentIo::Lists(document));
 }
 
 } // namespace
@@ -160,140 +262,62 @@ std::optional<Kind> KindOf(std::wstring_view keyword) noexcept
 
 Parameter ParameterOf(const DCMFestwert& block)
 {
-    const bool text = dynamic_cast<const DCMTextstring*>(&block) != nullptr;
-    Parameter parameter = Named(text ? Kind::kTextstring : Kind::kFestwert, block);
-    parameter.unit = block.GetUnit();
-    CComVariant value;
-    block.GetValue(&value);
-    value = Plain(value);
-    if (value.vt != VT_EMPTY)
-        parameter.values.push_back(std::move(value));
-    parameter.columns = parameter.values.size();
-    return parameter;
+    return TakeCopy(block);
 }
 
 Parameter ParameterOf(const DCMFestwerteblock& block)
 {
-    Parameter parameter = Named(Kind::kFestwerteblock, block);
-    parameter.unit = block.GetUnit();
-    parameter.countX = block.GetXValueCount();
-    parameter.countY = block.GetYValueCount();
-    for (const double number : block.GetDoubleValues())
-        parameter.values.emplace_back(number);
-    for (const CString& text : block.GetStringValues())
-        parameter.values.emplace_back(text);
-    const bool rows = parameter.countX > 0 && parameter.countY > 0;
-    parameter.columns = rows ? static_cast<std::size_t>(parameter.countX) : parameter.values.size();
-    return parameter;
+    return TakeCopy(block);
 }
 
 Parameter ParameterOf(const DCMStuetzstellenverteilung& block)
 {
-    Parameter parameter = Named(Kind::kStuetzstellenverteilung, block);
-    parameter.x.unit = block.GetUnit();
-    block.GetValues(parameter.x.points);
-    DropUnwritten(parameter.x.points);
-    return parameter;
+    return TakeCopy(block);
 }
 
 Parameter ParameterOf(const DCMKennlinie& block)
 {
-    Kind kind = Kind::kKennlinie;
-    if (dynamic_cast<const DCMFestkennlinie*>(&block) != nullptr) {
-        kind = Kind::kFestkennlinie;
-    } else if (dynamic_cast<const DCMGruppenkennlinie*>(&block) != nullptr) {
-        kind = Kind::kGruppenkennlinie;
-    }
-    Parameter parameter = Named(kind, block);
-    parameter.x.unit = block.GetUnit_X();
-    parameter.x.distribution = block.GetStuetzstellenverteilung();
-    parameter.unit = block.GetUnit_W();
-    parameter.countX = block.GetAxisLenghtX();
-    block.GetAxis(parameter.x.points);
-    block.GetValues(parameter.values);
-    DropUnwritten(parameter.x.points);
-    DropUnwritten(parameter.values);
-    parameter.columns = parameter.values.size();
-    return parameter;
+    return TakeCopy(block);
 }
 
 Parameter ParameterOf(const DCMKennfeld& block)
 {
-    Kind kind = Kind::kKennfeld;
-    if (dynamic_cast<const DCMFestkennfeld*>(&block) != nullptr) {
-        kind = Kind::kFestkennfeld;
-    } else if (dynamic_cast<const DCMGruppenkennfeld*>(&block) != nullptr) {
-        kind = Kind::kGruppenkennfeld;
-    }
-    Parameter parameter = Named(kind, block);
-    parameter.x.unit = block.GetUnit_X();
-    parameter.x.distribution = block.GetStuetzstellenverteilungX();
-    parameter.y.unit = block.GetUnit_Y();
-    parameter.y.distribution = block.GetStuetzstellenverteilungY();
-    parameter.unit = block.GetUnit_W();
-    parameter.countX = block.GetAxisLenghtX();
-    parameter.countY = block.GetAxisLenghtY();
-    block.GetAxis_X(parameter.x.points);
-    block.GetAxis_Y(parameter.y.points);
-    block.GetValues(parameter.values);
-    DropUnwritten(parameter.x.points);
-    DropUnwritten(parameter.y.points);
-    DropUnwritten(parameter.values);
-    parameter.columns = parameter.x.points.size();
-    return parameter;
+    return TakeCopy(block);
 }
 
 std::vector<Parameter> ParametersOf(const DCMConverter& document)
 {
     std::vector<Parameter> parameters;
+    parameters.reserve(CountOfBlocks(document));
     ForEach(document, [&](const auto& block) { parameters.push_back(ParameterOf(block)); });
     return parameters;
 }
 
 std::vector<Parameter> ParametersOf(DCMConverter&& document)
 {
-    return ParametersOf(std::as_const(document));
+    std::vector<Parameter> parameters;
+    parameters.reserve(CountOfBlocks(document));
+    const auto takeAll = [&](auto& blocks) {
+        for (; !blocks.empty(); blocks.pop_front())
+            parameters.push_back(Take(blocks.front()));
+    };
+    std::apply([&](auto&... lists) { (takeAll(lists), ...); }, DocumentIo::Lists(document));
+    return parameters;
 }
 
 void Add(DCMConverter& document, const Parameter& parameter)
 {
-    switch (parameter.kind) {
-    case Kind::kFestwert:
-        document.AddFestwert(ValueBlock<DCMFestwert>(parameter));
-        break;
-    case Kind::kFestwerteblock:
-        document.AddFestwerteblock(ListBlock(parameter));
-        break;
-    case Kind::kStuetzstellenverteilung:
-        AddDistribution<DCMStuetzstellenverteilung>(document, parameter);
-        break;
-    case Kind::kKennlinie:
-        document.AddKennlinie(Curve<DCMKennlinie>(parameter));
-        break;
-    case Kind::kFestkennlinie:
-        document.AddFestkennlinie(Curve<DCMFestkennlinie>(parameter));
-        break;
-    case Kind::kGruppenkennlinie:
-        document.AddGruppenkennlinie(Curve<DCMGruppenkennlinie>(parameter));
-        break;
-    case Kind::kKennfeld:
-        document.AddKennfeld(Map<DCMKennfeld>(parameter));
-        break;
-    case Kind::kFestkennfeld:
-        document.AddFestkennfeld(Map<DCMFestkennfeld>(parameter));
-        break;
-    case Kind::kGruppenkennfeld:
-        document.AddGruppenkennfeld(Map<DCMGruppenkennfeld>(parameter));
-        break;
-    case Kind::kTextstring:
-        document.AddTextstring(ValueBlock<DCMTextstring>(parameter));
-        break;
-    }
+    Add(document, Parameter(parameter));
 }
 
 void Add(DCMConverter& document, Parameter&& parameter)
 {
-    Add(document, std::as_const(parameter));
+    auto kind = kKinds.begin();
+    const auto add = [&](auto& blocks) {
+        if (*kind++ == parameter.kind)
+            Append(parameter, blocks);
+    };
+    std::apply([&](auto&... lists) { (add(lists), ...); }, DocumentIo::Lists(document));
 }
 
 CString HeaderOfComment(const CString& comment)
@@ -356,16 +380,11 @@ void BlockVisitor::Visit(const DCMTextstring&)
 
 void ForEach(const DCMConverter& document, BlockVisitor& visitor)
 {
-    VisitAll(document.GetFestwerte(), visitor);
-    VisitAll(document.GetFestwerteblock(), visitor);
-    VisitAll(document.GetStuetzstellenverteilung(), visitor);
-    VisitAll(document.GetKennlinie(), visitor);
-    VisitAll(document.GetFestkennlinie(), visitor);
-    VisitAll(document.GetGruppenkennlinie(), visitor);
-    VisitAll(document.GetKennfeld(), visitor);
-    VisitAll(document.GetFestkennfeld(), visitor);
-    VisitAll(document.GetGruppenkennfeld(), visitor);
-    VisitAll(document.GetTextstring(), visitor);
+    const auto visitAll = [&](const auto& blocks) {
+        for (const auto& block : blocks)
+            visitor.Visit(block);
+    };
+    std::apply([&](const auto&... lists) { (visitAll(lists), ...); }, DocumentIo::Lists(document));
 }
 
 } // namespace dcm
