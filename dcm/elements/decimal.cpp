@@ -81,9 +81,26 @@ constexpr auto MakePowers()
     return powers;
 }
 
+constexpr auto MakePowerBits()
+{
+    std::array<std::uint64_t, kMaxNormalPower - kMinNormalPower + 1> bits{};
+    for (int power = kMinNormalPower; power <= kMaxNormalPower; ++power) {
+        const auto& [high, low] = kPowers[PowerIndex(power)];
+        constexpr int places = 63 - kFractionBits;
+        constexpr auto lost = (std::uint64_t{1} << places) - 1;
+        // The highest bit of the significand adds 1 to the exponent.
+        const auto biased = static_cast<std::uint64_t>(Exponent2(power) + kExponentBias - 1);
+        bits[static_cast<std::size_t>(power - kMinNormalPower)] =
+            (biased << kFractionBits) + (high >> places) + ((high & lost) != 0 || low != 0 ? 1 : 0);
+    }
+    return bits;
+}
+
 } // namespace
 
 constexpr std::array<Power, kMaxPower - kMinPower + 1> kPowers = MakePowers();
+constexpr std::array<std::uint64_t, kMaxNormalPower - kMinNormalPower + 1> kPowerBits =
+    MakePowerBits();
 
 Decimal ToDecimalExactly(double value, int count) noexcept
 {

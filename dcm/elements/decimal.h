@@ -69,44 +69,53 @@ constexpr int Exponent10(int power)
     return (power * 1'262'611) >> 22;
 }
 
+/// H, the upper 128 bits of w x T.
+constexpr WideProduct UpperProduct(std::uint64_t w, const Power& power)
+{
+    const auto upper = Multiply(w, power.high);
+    const auto low = upper.low + Multiply(w, power.low).high;
+    return {upper.high + (low < upper.low ? 1 : 0), low};
+}
+
+/// The bits of the lowest double from each power of ten on that is a normal number.
+constexpr int kMinNormalPower = -307;
+constexpr int kMaxNormalPower = 308;
+extern const std::array<std::uint64_t, kMaxNormalPower - kMinNormalPower + 1> kPowerBits;
+
 /// `value`, finite and above zero, correctly rounded to `count` (15 or 17) significant digits, ties
 /// to even: `digits` has just that many. By the standard library.
 Decimal ToDecimalExactly(double value, int count) noexcept;
 
-/// The same, for almost all numbers by one product.
-inline Decimal ToDecimal(double value, int count) noexcept
+/// The same for a normal number above zero, given by its bits: for almost all by one product. Where
+/// rounding up adds a digit, `digits` is 10^count.
+inline Decimal ToDecimal(std::uint64_t bits, int count) noexcept
 {
-    const auto bits = std::bit_cast<std::uint64_t>(value);
-    const auto biased = static_cast<int>(bits >> kFractionBits);
-    if (biased == 0) {
-        return ToDecimalExactly(value, count);
-    }
-    // value = w x 2^exponent, the highest bit of w set.
+    // The number is w x 2^exponent, with the highest bit of w set.
     const auto w = bits << (63 - kFractionBits) | kSignBit;
-    const int exponent = biased - kExponentBias - 63;
+    const int exponent = static_cast<int>(bits >> kFractionBits) - kExponentBias - 63;
 
-    // The power of ten of the first digit: that of the power of two, or one more if the next power
-    // of ten is between the power of two and the value.
-    int first = Exponent10(exponent + 63);
-    const auto& next = kPowers[PowerIndex(first + 1)];
-    first += static_cast<int>(Exponent2(first + 1) == exponent + 63) &
-             static_cast<int>(w >= next.high + (next.low != 0 ? 1 : 0));
+    // The power of ten of the first digit: that of the power of two, or one more from the next
+    // power of ten on.
+    const int below = Exponent10(exponent + 63);
+    const auto next = kPowerBits[static_cast<std::size_t>(below + 1 - kMinNormalPower)];
+    const int first = below + (bits >= next ? 1 : 0);
 
     // The upper word of H has `places` bits after the point.
     const int last = first - count + 1;
     const auto& power = kPowers[PowerIndex(-last)];
-    const auto upper = Multiply(w, power.high);
-    const auto low = upper.low + Multiply(w, power.low).high;
-    const auto high = upper.high + (low < upper.low ? 1 : 0);
     const int places = -1 - exponent - Exponent2(-last);
     const auto half = std::uint64_t{1} << (places - 1);
-    const auto fraction = high & (2 * half - 1);
-    if (fraction + 1 - half <= 1 && low + 1 <= 1) {
-        return ToDecimalExactly(value, count);
+    const auto isOpen = [half](std::uint64_t high) {
+        return ((high + half + 1) & (2 * half - 1)) <= 1;
+    };
+    auto high = Multiply(w, power.high).high;
+    if (isOpen(high)) [[unlikely]] {
+        const auto product = UpperProduct(w, power);
+        if (isOpen(product.high) && product.low + 1 <= 1)
+            return ToDecimalExactly(std::bit_cast<double>(bits), count);
+        high = product.high;
     }
-    const auto digits = (high + half) >> places;
-    const auto limit = count == 17 ? 10 * kTenTo16 : kTenTo16 / 10;
-    return digits == limit ? Decimal{limit / 10, last + 1} : Decimal{digits, last};
+    return {(high + half) >> places, last};
 }
 
 /// Stores the double nearest to `decimal` and returns true; false when one product of 64 bits does
@@ -189,7 +198,8 @@ constexpr std::uint64_t SplitEight(std::uint64_t number)
     // Each step divides all parts at once, by a product with the reciprocal, rounded up, which is
     // exact for parts this small. The quotient q goes to the lower half of a part and the remainder
     // n - q x d to the upper half: together (n << half) - q x ((d << half) - 1).
-    const auto two = (number << 32) - number / 10'000 * ((std::uint64_t{10'000} << 32) - 1);
+    const auto thousands = (number * 109'951'163) >> 40;
+    const auto two = (number << 32) - thousands * ((std::uint64_t{10'000} << 32) - 1);
     const auto hundreds = ((two * 10'486) >> 20) & 0x0000'007F'0000'007F;
     const auto four = (two << 16) - hundreds * ((100 << 16) - 1);
     const auto tens = ((four * 103) >> 10) & 0x000F'000F'000F'000F;

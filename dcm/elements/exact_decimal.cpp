@@ -120,9 +120,7 @@ bool ByOneProduct(Decimal decimal, double& value)
     const auto& power = kPowers[PowerIndex(decimal.exponent)];
     const int zeros = std::countl_zero(decimal.digits);
     const auto w = decimal.digits << zeros;
-    const auto upper = Multiply(w, power.high);
-    const auto low = upper.low + Multiply(w, power.low).high;
-    const auto high = upper.high + (low < upper.low ? 1 : 0);
+    const auto [high, low] = UpperProduct(w, power);
     // The highest bit of the product is that of `high`, or the next one.
     const int shift = std::countl_zero(high);
     const auto word = high << shift | (shift == 0 ? 0 : low >> 63);

@@ -75,36 +75,47 @@ constexpr std::uint64_t InsertPoint(std::uint64_t text, std::uint64_t mark)
     return before | (text ^ before) << 8 | mark * '.';
 }
 
-/// Writes seventeen digits: the first, eight in `upper`, eight in `lower`. A point follows the
-/// first and as many others as `point` says, from 0 to 16; below 0, "0." and zeros come before all
-/// digits. A "0" follows where the point is the last character. Returns the place of the first
-/// digit.
-char* WriteDigits(char first, std::uint64_t upper, std::uint64_t lower, int point, char* to)
+/// The first of seventeen digits, and the other sixteen as the bytes of two words; all as
+/// characters.
+struct Digits
 {
-    if (point >= 8) {
-        to[0] = first;
-        StoreWord(upper, to + 1);
-        StoreWord(lower, to + 10);
-        StoreWord(InsertPoint(lower, point < 16 ? std::uint64_t{1} << (8 * (point - 8)) : 0),
-                  to + 9);
-        if (point == 16) {
-            to[17] = '.';
-            to[18] = '0';
-        }
-        return to;
-    }
+    char first;
+    std::uint64_t upper;
+    std::uint64_t lower;
+};
+
+/// Writes the digits with a point after the first and `point` others, from 0 to 7; below 0, "0."
+/// and zeros before the digits. Returns the place of the first digit.
+inline char* WriteAroundPoint(const Digits& digits, int point, char* to)
+{
     // No branch on the point: it changes from number to number. All digits are written where they
     // are after a point, then the upper ones once more with the point inserted.
     constexpr char zeros[] = {'0', '.', '0', '0', '0', '0', '0', '0'};
     std::memcpy(to, zeros, sizeof zeros);
-    const bool within = point >= 0;
-    to += within ? 0 : 1 - point;
-    to[0] = first;
-    char* const next = to + (within ? 2 : 1);
-    StoreWord(upper, next);
-    StoreWord(lower, next + 8);
-    StoreWord(InsertPoint(upper, std::uint64_t{within} << (8 * (point & 7))), to + 1);
+    const int within = point >= 0 ? 1 : 0;
+    to += std::max(1 - point, 1) - within;
+    to[0] = digits.first;
+    char* const next = to + 1 + within;
+    StoreWord(digits.upper, next);
+    StoreWord(digits.lower, next + 8);
+    StoreWord(InsertPoint(digits.upper, static_cast<std::uint64_t>(within) << (8 * (point & 7))),
+              to + 1);
     return to;
+}
+
+/// Writes the digits with a point after the first and `point` others, from 8 to 16; "0" follows a
+/// point at the end.
+void WriteBeforePoint(const Digits& digits, int point, char* to)
+{
+    to[0] = digits.first;
+    StoreWord(digits.upper, to + 1);
+    StoreWord(digits.lower, to + 10);
+    StoreWord(InsertPoint(digits.lower, point < 16 ? std::uint64_t{1} << (8 * (point - 8)) : 0),
+              to + 9);
+    if (point == 16) {
+        to[17] = '.';
+        to[18] = '0';
+    }
 }
 
 /// The exponent at the start of `text`, "e" included; 0 when there is none.
@@ -276,34 +287,46 @@ inline const char* TakeDecimal(const char* at, double& value)
 char* WriteNumber(double value, int digits, char* to) noexcept
 {
     const auto bits = std::bit_cast<std::uint64_t>(value);
-    *to++ = ' ';
-    *to = '-';
-    to += bits >> 63;
+    std::memcpy(to, " -", 2);
+    to += 1 + (bits >> 63);
     const auto magnitude = bits & ~kSignBit;
-    if (magnitude - 1 >= kInfinityBits - 1) {
-        const auto name = magnitude == 0 ? "0.0"sv : SpecialName(bits);
-        return std::copy(name.begin(), name.end(), to);
+    Decimal decimal;
+    constexpr auto minNormal = std::uint64_t{1} << kFractionBits;
+    if (magnitude - minNormal < kInfinityBits - minNormal) [[likely]] {
+        decimal = ToDecimal(magnitude, digits);
+    } else {
+        if (magnitude - 1 >= kInfinityBits - 1) {
+            const auto name = magnitude == 0 ? "0.0"sv : SpecialName(bits);
+            return std::copy(name.begin(), name.end(), to);
+        }
+        decimal = ToDecimalExactly(std::bit_cast<double>(magnitude), digits);
     }
-    const auto decimal = ToDecimal(std::bit_cast<double>(magnitude), digits);
-    const int exponent = decimal.exponent + digits - 1;
-    // The first of seventeen digits, and the other sixteen.
-    const auto whole = digits == 17 ? decimal.digits : decimal.digits * 100;
-    const auto firstNine = whole / kTenTo8;
-    const auto first = firstNine / kTenTo8;
-    const auto upper = SplitEight(firstNine - first * kTenTo8);
+    int exponent = decimal.exponent + digits - 1;
+    const auto whole = digits == kFullDigits ? decimal.digits : decimal.digits * 100;
+    const auto firstNine = static_cast<std::uint32_t>(whole / kTenTo8);
+    auto first = firstNine / std::uint32_t{kTenTo8};
+    const auto upper = SplitEight(firstNine - first * std::uint32_t{kTenTo8});
     const auto lower = SplitEight(whole - firstNine * kTenTo8);
-    // Up to the last digit that is not 0. No branch: long and short numbers are mixed.
-    const auto used = lower != 0 ? ~std::uint64_t{0} : 0;
-    const int count =
-        9 + static_cast<int>(used & 8) - std::countl_zero(upper ^ ((upper ^ lower) & used)) / 8;
+    if (first == 10) [[unlikely]] {
+        first = 1;
+        ++exponent;
+    }
+    // Up to the last digit that is not 0: how many bytes its word uses, and the digits before it.
+    const auto used = std::bit_width((lower != 0 ? lower : upper) * 2 + 1);
+    const int count = static_cast<int>(static_cast<unsigned>(used + 6) / 8) + (lower != 0 ? 9 : 1);
+    const Digits text{static_cast<char>('0' + first), upper | RepeatByte('0'),
+                      lower | RepeatByte('0')};
 
-    const bool inFixed = exponent >= kFixedMin && exponent < digits;
-    const int point = inFixed ? exponent : 0;
-    to = WriteDigits(static_cast<char>('0' + first), upper | RepeatByte('0'),
-                     lower | RepeatByte('0'), point, to);
-    if (!inFixed)
-        return WriteExponent(exponent, to + (count > 1 ? count + 1 : 1));
-    return to + std::max(count, point + 2) + (point < 0 ? 0 : 1);
+    if (exponent >= kFixedMin && exponent < 8) [[likely]] {
+        to = WriteAroundPoint(text, exponent, to);
+        return to + std::max(count, exponent + 2) + (exponent < 0 ? 0 : 1);
+    }
+    if (exponent >= 8 && exponent < digits) {
+        WriteBeforePoint(text, exponent, to);
+        return to + std::max(count, exponent + 2) + 1;
+    }
+    WriteAroundPoint(text, 0, to);
+    return WriteExponent(exponent, to + (count > 1 ? count + 1 : 1));
 }
 
 double ReadDecimal(std::string_view text) noexcept
