@@ -118,34 +118,37 @@ inline Decimal ToDecimal(std::uint64_t bits, int count) noexcept
     return {(high + half) >> places, last};
 }
 
+/// Between these powers of ten, every product with 64 bits of digits is a normal number.
+constexpr int kMinSafePower = -290;
+constexpr int kMaxSafePower = 288;
+
 /// Stores the double nearest to `decimal` and returns true; false when one product of 64 bits does
-/// not tell, as for one number of many digits in five hundred, or when the result is neither 0 nor
-/// a normal number.
+/// not tell, as for one number of many digits in five hundred, or when the power of ten is not
+/// safe.
 inline bool ToDouble(Decimal decimal, double& value) noexcept
 {
     if (decimal.digits == 0) {
         value = 0.0;
         return true;
     }
-    const auto index = static_cast<unsigned>(decimal.exponent - kMinPower);
-    if (index >= kPowers.size()) {
+    const auto index = static_cast<unsigned>(decimal.exponent - kMinSafePower);
+    if (index > kMaxSafePower - kMinSafePower)
         return false;
-    }
     const int zeros = std::countl_zero(decimal.digits);
-    const auto h = Multiply(decimal.digits << zeros, kPowers[index].high).high;
+    const auto& power = kPowers[index + PowerIndex(kMinSafePower)];
+    const auto h = Multiply(decimal.digits << zeros, power.high).high;
     // H becomes a significand of 53 bits and 10 more. Where it loses a bit by that, the exact
     // product still lies in [H, H + 2).
     constexpr int places = 10;
     constexpr auto half = std::uint64_t{1} << (places - 1);
     const int above = static_cast<int>(h >> 63);
     const auto significand = h >> above;
-    const int biased =
-        Exponent2(decimal.exponent) + 1 + above - zeros + places + kFractionBits + kExponentBias;
-    if ((significand + 1 - half) % (2 * half) <= 1 || biased < 1 || biased >= 2 * kExponentBias) {
+    if ((significand + 1 - half) % (2 * half) <= 1)
         return false;
-    }
     // The significand's highest bit adds 1 to the exponent, and rounding up may carry into it.
-    value = std::bit_cast<double>((static_cast<std::uint64_t>(biased - 1) << kFractionBits) +
+    constexpr int offset = places + kFractionBits + kExponentBias;
+    const int biased = Exponent2(decimal.exponent) + above + (offset - zeros);
+    value = std::bit_cast<double>((static_cast<std::uint64_t>(biased) << kFractionBits) +
                                   ((significand + half) >> places));
     return true;
 }
@@ -166,28 +169,11 @@ constexpr std::uint64_t NotDigits(std::uint64_t bytes)
     return (bytes | (bytes + RepeatByte(kNotDigit - 10))) & RepeatByte(kNotDigit);
 }
 
-/// The highest bit of each byte that is not a point; the other bits mean nothing. A slash after a
-/// point counts as another point.
-constexpr std::uint64_t NotPoints(std::uint64_t bytes)
-{
-    // The sum is the negative of the byte, which has the highest bit set for 1 to 128. Only a
-    // point, which is 0, carries into the next byte; the negative of a slash, which is 1, becomes 0
-    // by that.
-    const auto others = bytes ^ RepeatByte('.' ^ '0');
-    return others | (~others + RepeatByte(1));
-}
-
-/// Whether bytes that are digits or points are all digits.
-constexpr bool AreDigits(std::uint64_t bytes)
-{
-    return (bytes & RepeatByte(('.' ^ '0') & 0xF0)) == 0;
-}
-
 /// The number whose digits are the bytes 0 to 9 of a word, the first in the lowest byte.
 constexpr std::uint64_t JoinEight(std::uint64_t bytes)
 {
-    // Each step joins neighbours by one product: pairs of digits, of two digits, of four.
-    bytes = (bytes * (1 + (10 << 8))) >> 8 & 0x00FF'00FF'00FF'00FF;
+    // Each step joins neighbours: pairs of digits, of two digits, of four.
+    bytes = (bytes * 10 + (bytes >> 8)) & 0x00FF'00FF'00FF'00FF;
     bytes = (bytes * (1 + (100 << 16))) >> 16 & 0x0000'FFFF'0000'FFFF;
     return (bytes * (1 + (std::uint64_t{10'000} << 32))) >> 32;
 }

@@ -184,60 +184,60 @@ inline bool FitsInDecimal(const char* at, const char* end)
 
 /// The bytes of a word, with those before the first of `others` moved up by one, so that they
 /// overwrite it: if it is the point, the digits are then adjacent.
-inline std::uint64_t WithoutPoint(std::uint64_t bytes, std::uint64_t others)
+inline std::uint64_t WithoutFirst(std::uint64_t bytes, std::uint64_t others)
 {
     const auto upToFirst = others ^ (others - 1);
     return (bytes & ~upToFirst) | (bytes & upToFirst >> 8) << 8;
 }
 
-/// TakeFixed for a number that goes on after its first eight characters.
-inline const char* TakeLong(const char* at, std::uint64_t bytes, std::uint64_t others,
-                            Decimal& decimal)
+/// TakeFixed for a number whose first eight characters are digits.
+inline const char* TakeLongInteger(const char* at, Decimal& decimal)
 {
-    if (others == 0) {
-        const auto* const start = at;
-        at = TakeDigits(at, decimal.digits);
-        if (*at == '.') {
-            const auto* const fraction = at + 1;
-            at = TakeDigits(fraction, decimal.digits);
-            decimal.exponent = static_cast<int>(fraction - at);
-        }
-        return FitsInDecimal(start, at) ? at : nullptr;
+    const auto* const start = at;
+    at = TakeDigits(at, decimal.digits);
+    if (*at == '.') {
+        const auto* const fraction = at + 1;
+        at = TakeDigits(fraction, decimal.digits);
+        decimal.exponent = static_cast<int>(fraction - at);
     }
-    const auto digits = WithoutPoint(bytes, others);
+    return FitsInDecimal(start, at) ? at : nullptr;
+}
+
+/// TakeFixed for a number whose first eight characters, `bytes`, are seven digits and a point at
+/// `point`.
+inline const char* TakeLongFraction(const char* at, std::uint64_t digits, std::size_t point,
+                                    Decimal& decimal)
+{
     const auto seven = JoinEight(digits);
     decimal.digits = seven;
     const auto* const end = TakeDigits(at + 8, decimal.digits);
     const auto count = end - at - 8;
     const bool fits =
         count <= 12 || (count <= 19 && seven < kTens[static_cast<std::size_t>(19 - count)]);
-    if (!fits || !AreDigits(digits)) {
-        return nullptr;
-    }
-    decimal.exponent = static_cast<int>(LowestByteSet(others)) - 7 - static_cast<int>(count);
-    return end;
+    decimal.exponent = static_cast<int>(point) - 7 - static_cast<int>(count);
+    return fits ? end : nullptr;
 }
 
 /// Reads the digits at `at` and a point among them; returns their end, or a null pointer when there
-/// is no digit, more than one point or too many digits.
+/// is no digit or too many of them.
 inline const char* TakeFixed(const char* at, Decimal& decimal)
 {
     const auto bytes = DigitBytes(at);
     const auto others = NotDigits(bytes);
-    const auto ends = others & NotPoints(bytes);
-    if (ends == 0) {
-        return TakeLong(at, bytes, others, decimal);
-    }
+    if (others == 0)
+        return TakeLongInteger(at, decimal);
+    const auto first = LowestByteSet(others);
+    const auto digits = WithoutFirst(bytes, others);
+    const auto ends = at[first] == '.' ? others & (others - 1) : others;
+    if (ends == 0)
+        return TakeLongFraction(at, digits, first, decimal);
     // No branch on where the point is and how long the number: that changes from one to the next.
     const auto size = LowestByteSet(ends);
-    const auto whole = LowestByteSet(others) + 1;
-    const auto last = std::max(size, whole);
-    const auto digits = WithoutPoint(bytes, others) << ((64 - 8 * last) % 64);
-    if (last == 1 || !AreDigits(digits)) {
+    const auto last = std::max(size, first + 1);
+    if (last == 1)
         return nullptr;
-    }
-    decimal.digits = JoinEight(digits);
-    decimal.exponent = static_cast<int>(whole - last);
+    decimal.digits = JoinEight(digits << ((64 - 8 * last) % 64));
+    decimal.exponent = static_cast<int>(first + 1 - last);
     return at + size;
 }
 
@@ -261,25 +261,33 @@ const char* TakeExponent(const char* at, int& exponent)
     return last;
 }
 
-/// Reads the decimal number at `at` in the forms that are frequent in files, and returns its end.
-/// After a null pointer, or an end within the token, the token must be read by ReadToken.
-inline const char* TakeDecimal(const char* at, double& value)
+/// Takes a minus sign from `at`; returns the sign bit of the number.
+inline std::uint64_t TakeMinus(const char*& at)
 {
     const std::uint64_t negative = *at == '-' ? 1 : 0;
     at += negative;
-    Decimal decimal;
-    at = TakeFixed(at, decimal);
-    if (at == nullptr) {
-        return nullptr;
-    }
-    if (*at != ' ') {
-        at = TakeExponent(at, decimal.exponent);
-    }
-    if (!ToDouble(decimal, value)) {
+    return negative << 63;
+}
+
+/// The number nearest to `decimal`, with the given sign bit.
+inline double SignedDouble(Decimal decimal, std::uint64_t sign)
+{
+    double value = 0.0;
+    if (!ToDouble(decimal, value)) [[unlikely]]
         value = NearestDouble(decimal);
-    }
-    value = std::bit_cast<double>(std::bit_cast<std::uint64_t>(value) | negative << 63);
-    return at;
+    return std::bit_cast<double>(std::bit_cast<std::uint64_t>(value) | sign);
+}
+
+/// Reads the token from `at` to `end`, where a number cannot go on. Few forms need ReadToken.
+double ReadKnownToken(const char* at, const char* end)
+{
+    const auto* next = at;
+    const auto sign = TakeMinus(next);
+    Decimal decimal;
+    next = TakeFixed(next, decimal);
+    if (next != nullptr && TakeExponent(next, decimal.exponent) == end)
+        return SignedDouble(decimal, sign);
+    return ReadToken({at, static_cast<std::size_t>(end - at)});
 }
 
 } // namespace
@@ -361,37 +369,29 @@ double ReadNumber(std::string_view token) noexcept
     }
     std::array<char, longest + kReadAhead> piece{};
     token.copy(piece.data(), longest);
-    double value = 0.0;
-    return TakeDecimal(piece.data(), value) == piece.data() + token.size() ? value
-                                                                           : ReadToken(token);
+    return ReadKnownToken(piece.data(), piece.data() + token.size());
 }
 
 std::size_t NumberReader::Next(std::span<double> values) noexcept
 {
     const char* at = m_at;
     const char* const end = m_end;
-    auto to = values.begin();
-    while (at != nullptr && to != values.end()) {
-        double& value = *to++;
-        const char* const last = TakeDecimal(at, value);
-        if (last != nullptr && *last == ' ' && last < end)
-            at = SkipWhite(last + 1, end);
-        else if (last == end)
-            at = nullptr;
-        else
-            value = NextOfAnyKind(at);
+    std::size_t count = 0;
+    for (; at != nullptr && count < values.size(); ++count) {
+        const auto* last = at;
+        const auto sign = TakeMinus(last);
+        Decimal decimal;
+        last = TakeFixed(last, decimal);
+        if (last != nullptr && (*last == ' ' || last == end)) [[likely]] {
+            values[count] = SignedDouble(decimal, sign);
+        } else {
+            last = std::find(at, end, ' ');
+            values[count] = ReadKnownToken(at, last);
+        }
+        at = last < end ? SkipWhite(last + 1, end) : nullptr;
     }
     m_at = at;
-    return static_cast<std::size_t>(to - values.begin());
-}
-
-/// Reads a token of any kind and length; `at` becomes the start of the token after it, or null.
-double NumberReader::NextOfAnyKind(const char*& at) const
-{
-    const std::string_view rest(at, m_end);
-    const auto blank = rest.find(' ');
-    at = blank != rest.npos ? SkipWhite(at + blank, m_end) : nullptr;
-    return ReadToken(rest.substr(0, blank));
+    return count;
 }
 
 std::int32_t ReadInteger(std::string_view text) noexcept

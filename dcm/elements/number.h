@@ -53,8 +53,6 @@ public:
     std::size_t Next(std::span<double> values) noexcept;
 
 private:
-    double NextOfAnyKind(const char*& at) const;
-
     /// The start of the next token, or null when there is none.
     const char* m_at;
     const char* m_end;

@@ -45,7 +45,7 @@ constexpr std::uint64_t RepeatByte(unsigned char value)
 /// The index of the lowest byte of `word` that has a bit set. `word` must not be zero.
 inline std::size_t LowestByteSet(std::uint64_t word)
 {
-    return static_cast<std::size_t>(std::countr_zero(word)) / 8;
+    return static_cast<unsigned>(std::countr_zero(word)) / 8;
 }
 
 } // namespace dcm
