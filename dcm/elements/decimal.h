@@ -25,7 +25,6 @@
 namespace dcm {
 
 constexpr std::uint64_t kTenTo8 = 100'000'000;
-constexpr std::uint64_t kTenTo16 = kTenTo8 * kTenTo8;
 
 /// The layout of a double: sign, 11 bits of exponent, 52 of fraction.
 constexpr std::uint64_t kSignBit = 0x8000'0000'0000'0000;

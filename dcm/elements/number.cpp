@@ -8,13 +8,11 @@
 #include <algorithm>
 #include <array>
 #include <bit>
-#include <charconv>
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
 #include <limits>
 #include <string_view>
-#include <system_error>
 
 namespace dcm {
 namespace {
@@ -203,8 +201,8 @@ inline const char* TakeLongInteger(const char* at, Decimal& decimal)
     return FitsInDecimal(start, at) ? at : nullptr;
 }
 
-/// TakeFixed for a number whose first eight characters, `bytes`, are seven digits and a point at
-/// `point`.
+/// TakeFixed for a number that has a point, at `point`, and seven digits, `digits`, in its first
+/// eight characters.
 inline const char* TakeLongFraction(const char* at, std::uint64_t digits, std::size_t point,
                                     Decimal& decimal)
 {
