@@ -3,6 +3,9 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <functional>
+#include <limits>
+#include <sstream>
 #include <string>
 #include <utility>
 
@@ -22,7 +25,60 @@ std::string Listed(const dcm::Report& report)
     return text;
 }
 
+/// The bytes of `text` with each \xNN as a byte.
+std::string Bytes(const std::string& text)
+{
+    std::string bytes;
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        if (text[i] == '\\' && text.substr(i, 2) == "\\x") {
+            bytes += static_cast<char>(std::stoi(text.substr(i + 2, 2), nullptr, 16));
+            i += 3;
+        } else {
+            bytes += text[i];
+        }
+    }
+    return bytes;
+}
+
 } // namespace
+
+TEST(Findings, AreThoseThatTheFilesOfTheTableGive)
+{
+    const std::string table = DCM_TEST_DATA "/findings/import.txt";
+    std::istringstream lines(Unmarked(ReadBytes(dcm::FromUtf8(table))) + "\n");
+    const Folder folder;
+    std::string title, file, expected;
+    int number = 0, titleLine = 0, cases = 0;
+    for (std::string line; std::getline(lines, line);) {
+        ++number;
+        if (line.starts_with("|+")) {
+            file += line.substr(2);
+        } else if (line.starts_with("|")) {
+            file += line.substr(1) + "\n";
+        } else if (line.starts_with(">")) {
+            expected += line.substr(1) + "\n";
+        } else if (!line.empty() && line[0] != '#') {
+            title = line;
+            titleLine = number;
+        } else if (!title.empty()) {
+            const testing::ScopedTrace trace(table.c_str(), titleLine, title);
+            const unsigned page =
+                title.find(": ") == title.npos ? 1252U : static_cast<unsigned>(std::stoul(title));
+            ASSERT_TRUE(dcm::SetThreadCodePage(page));
+            const CString path = folder / L"in.dcm";
+            WriteBytes(path, Bytes(file));
+            DCMConverter document, plain;
+            dcm::Report report;
+            EXPECT_EQ(dcm::Import(document, path, report), plain.Import(path));
+            EXPECT_EQ(Listed(report), expected);
+            EXPECT_EQ(ExportBytes(document), ExportBytes(plain));
+            ASSERT_TRUE(dcm::SetThreadCodePage(1252));
+            title = file = expected = "";
+            ++cases;
+        }
+    }
+    EXPECT_GT(cases, 20);
+}
 
 TEST(Report, SaysWhyAFileCannotBeUsed)
 {
@@ -98,4 +154,104 @@ TEST(Report, IsEmptiedByTheNextCall)
     EXPECT_EQ(moved.Summary(), L"no findings");
     EXPECT_EQ(moved.Count() + moved.Limit(), 0U);
     EXPECT_FALSE(moved.Incomplete());
+}
+
+TEST(Findings, OfTheSampleAreNotesAndATruthWord)
+{
+    DCMConverter document;
+    dcm::Report report;
+    EXPECT_EQ(dcm::Import(document, DCM_SAMPLE, report), S_OK);
+    EXPECT_EQ(report.Count(dcm::Severity::kError), 0U);
+    EXPECT_EQ(report.Count(dcm::Severity::kWarning), report.Count("truth-word"));
+    DCMConverter copy;
+    for (const dcm::Parameter& parameter : dcm::ParametersOf(document))
+        dcm::Add(copy, parameter);
+    EXPECT_EQ(dcm::Export(copy, dcm::NullDevice(), report), S_OK);
+    EXPECT_EQ(Listed(report), "");
+}
+
+TEST(Findings, OfAnExportTellWhatTheFileLacks)
+{
+    const auto add = [](const wchar_t* block) {
+        return [block](DCMConverter& d) {
+            if (std::wstring_view(block).starts_with(L"KENNFELD")) {
+                DCMKennfeld b;
+                b.Init(block);
+                d.AddKennfeld(b);
+            } else if (std::wstring_view(block).starts_with(L"FESTWERTEBLOCK")) {
+                DCMFestwerteblock b;
+                b.Init(block);
+                d.AddFestwerteblock(b);
+            } else {
+                DCMKennlinie b;
+                b.Init(block);
+                d.AddKennlinie(b);
+            }
+        };
+    };
+    const auto value = [](const CComVariant& v) {
+        return [copy = v](DCMConverter& d) {
+            DCMFestwert b;
+            b.SetName(L"A");
+            b.SetValue(copy);
+            d.AddFestwert(b);
+        };
+    };
+    const auto text = [](const wchar_t* t) {
+        return [t](DCMConverter& d) {
+            DCMStuetzstellenverteilung b;
+            b.SetName(L"A");
+            b.AddValue(t);
+            d.AddStuetzstellenverteilung(b);
+        };
+    };
+    const double nan = std::numeric_limits<double>::quiet_NaN();
+    const struct
+    {
+        const char* title;
+        std::function<void(DCMConverter&)> fill;
+        const char* expected;
+    } cases[] = {
+        {"nothing", [](DCMConverter&) {}, ""},
+        {"no value", value(CComVariant()), "5 warning no-value FESTWERT A\n"},
+        {"an integer", value(CComVariant(7)), ""},
+        {"truth word", value(L"true"), "7 warning truth-word FESTWERT A\n"},
+        {"not a number", value(nan), "5 error lost-nan FESTWERT A\n7 error lost-nan FESTWERT A\n"},
+        {"line end", value(L"a\nb"), "5 error character-replaced FESTWERT A\n"},
+        {"trimmed", value(L" a"),
+         "5 warning text-trimmed FESTWERT A\n7 warning text-trimmed FESTWERT A\n"},
+        {"page", value(L"\x4E2D"), "5 error not-in-code-page FESTWERT A\n"},
+        {"tab in a point", text(L"a\tb"), "5 error character-replaced STUETZSTELLENVERTEILUNG A\n"},
+        {"quote in a point", text(L"a\"b"),
+         "5 warning count-differs STUETZSTELLENVERTEILUNG A\n"
+         "5 warning text-altered STUETZSTELLENVERTEILUNG A\n"
+         "5 warning text-altered STUETZSTELLENVERTEILUNG A\n"
+         "8 warning text-altered STUETZSTELLENVERTEILUNG A\n"},
+        {"incomplete map", add(L"KENNFELD A 2 1\nST/X 1 2\nST/Y 1\nWERT 1\n"),
+         "0 error incomplete-map KENNFELD A\n"},
+        {"empty map", add(L"KENNFELD A 0 0\n"), "0 error empty-map KENNFELD A\n"},
+        {"surplus values", add(L"KENNFELD A 1 1\nST/X 1\nST/Y 1\nWERT 1 2\n"),
+         "5 error surplus-values KENNFELD A\n"},
+        {"numbers and texts", add(L"FESTWERTEBLOCK A 1\nWERT 1\nTEXT \"a\"\n"),
+         "5 error numbers-and-texts FESTWERTEBLOCK A\n"},
+        {"digits", add(L"FESTWERTEBLOCK A 1 @ 1\nWERT 0.12345678901234567\n"),
+         "5 warning digits-dropped FESTWERTEBLOCK A\n"},
+        {"reference", add(L"KENNLINIE A 1\n*SSTX B\nST/X 1\nWERT 1\n"),
+         "5 error reference-not-written KENNLINIE A\n"},
+        {"other types", add(L"KENNLINIE A 1\nST/X 1\nST_TX/X \"a\"\nWERT 1\n"),
+         "5 error value-not-written KENNLINIE A\n"},
+        {"header of a block", [](DCMConverter& d) { d.SetHeader(L"* c\nFESTWERT A\nWERT 1\nEND"); },
+         "2 error block-in-comment\n"},
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.title);
+        DCMConverter document;
+        c.fill(document);
+        dcm::Report report;
+        const Folder folder;
+        const CString path = folder / L"out.dcm";
+        EXPECT_EQ(dcm::Export(document, path, report), S_OK);
+        EXPECT_EQ(Listed(report), c.expected);
+        EXPECT_EQ(ReadBytes(path), ExportBytes(document));
+    }
 }

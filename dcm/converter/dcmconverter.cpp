@@ -1,7 +1,9 @@
 #include "dcm/converter/dcmconverter.h"
 
 #include "dcm/converter/document_io.h"
+#include "dcm/converter/import_report.h"
 #include "dcm/elements/block_io.h"
+#include "dcm/elements/block_report.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/platform/text.h"
 #include "dcm/textfile/file_text.h"
@@ -11,6 +13,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <iterator>
+#include <new>
 #include <string_view>
 #include <utility>
 
@@ -51,8 +54,11 @@ HRESULT Insert(std::list<Block>& blocks, const dcm::FileBlock& block)
 {
     std::list<Block> fresh(1);
     const HRESULT result = dcm::BlockIo::Read(block, fresh.front());
-    if (SUCCEEDED(result))
+    if (SUCCEEDED(result)) {
         blocks.splice(blocks.end(), fresh);
+        if (block.Report() != nullptr)
+            block.Report()->SetStored(&blocks.back());
+    }
     return result;
 }
 
@@ -94,7 +100,7 @@ HRESULT DCMConverter::Import(const CString& strPath)
 }
 
 void dcm::DocumentIo::Import(DCMConverter& document, const CString& path, FileStage& stage,
-                             FindingList*)
+                             ImportReport* report)
 {
     PravFile file;
     CFileException error;
@@ -106,8 +112,80 @@ void dcm::DocumentIo::Import(DCMConverter& document, const CString& path, FileSt
     stage = FileStage::kBlocks;
     document.m_bBlockSeen = 0;
     FileBlock block;
+    if (report != nullptr)
+        report->BeginText(BlockIo::TextOf(file), 1);
     while (BlockIo::Next(file, block))
+        Read(document, block, report, true);
+    if (report != nullptr) {
+        const bool lineEnds = BlockIo::AddRest(file, block);
+        report->Unfinished(block, lineEnds);
+        report->End(document);
+    }
+}
+
+void dcm::DocumentIo::Read(DCMConverter& document, FileBlock& block, ImportReport* report,
+                           bool keep)
+{
+    if (report == nullptr) {
         document.AnalyzeToken(block);
+        return;
+    }
+    BlockReport& lines = report->Block();
+    block.SetReport(&lines);
+    lines.SetStored(nullptr);
+    try {
+        document.AnalyzeToken(block);
+    } catch (const std::bad_alloc&) {
+        lines.Add(FindingKind::kOutOfMemory, {L"Memory ran out in this block."});
+        throw;
+    } catch (...) {
+        lines.Add(FindingKind::kStopped,
+                  {L"The line has no value where one must be; the import ends with it."});
+        throw;
+    }
+    if (keep && lines.Stored() != nullptr)
+        report->Keep(*lines.Stored(), lines.Kind(), lines.FirstLine(), lines.VariantLine(),
+                     lines.HasReferenceX() || lines.HasReferenceY());
+}
+
+void dcm::DocumentIo::DropBlocks(DCMConverter& document) noexcept
+{
+    document.m_listFestwerte.clear();
+    document.m_listFestwerteblock.clear();
+    document.m_listStuetzstellenverteilung.clear();
+    document.m_listKennlinie.clear();
+    document.m_listFestkennlinie.clear();
+    document.m_listGruppenkennlinie.clear();
+    document.m_listKennfeld.clear();
+    document.m_listFestkennfeld.clear();
+    document.m_listGruppenkennfeld.clear();
+    document.m_listTextstring.clear();
+}
+
+void dcm::DocumentIo::WriteHeader(const DCMConverter& document, PravFile& file)
+{
+    document.WriteHeader(file);
+}
+
+void dcm::DocumentIo::WriteFormat(const DCMConverter& document, PravFile& file)
+{
+    document.WriteFormat(file);
+}
+
+double dcm::DocumentIo::Version(const DCMConverter& document)
+{
+    return document.m_format.GetValue();
+}
+
+const std::list<DCMStuetzstellenverteilung>&
+dcm::DocumentIo::Distributions(const DCMConverter& document)
+{
+    return document.m_listStuetzstellenverteilung;
+}
+
+std::wstring_view dcm::DocumentIo::KeywordOf(std::size_t kind)
+{
+    return kKinds[kind].keyword;
 }
 
 /// Takes the text before the first blank as the keyword of the block. No keyword goes beyond the
@@ -116,24 +194,33 @@ HRESULT DCMConverter::AnalyzeToken(const dcm::FileBlock& block)
 {
     if (block.LineCount() == 0)
         return S_OK;
+    dcm::BlockReport* const report = block.Report();
     const std::string_view line = block.Line(0);
-    const std::size_t blank = line.find(' ');
-    if (blank == line.npos)
-        return S_OK;
-    const std::string_view keyword = line.substr(0, blank);
+    // Without a blank this is no keyword.
+    const std::string_view keyword = line.substr(0, std::min(line.find(' '), line.size()));
+    const bool blankFollows = keyword.size() < line.size();
     const auto& kinds = dcm::DocumentIo::kKinds;
     const auto* const kind = std::find_if(std::begin(kinds), std::end(kinds), [&](const auto& k) {
-        return dcm::EqualsNoCase(keyword, k.keyword);
+        return blankFollows && dcm::EqualsNoCase(keyword, k.keyword);
     });
     if (kind != std::end(kinds)) {
+        if (report != nullptr)
+            report->BeginKind(block, static_cast<std::size_t>(kind - std::begin(kinds)));
         // A block that its parser rejects is dropped, but it ends the comment like any other.
         (this->*kind->insert)(block);
         m_bBlockSeen = 1;
-    } else if (dcm::EqualsNoCase(keyword, dcm::keyword::kKonservierungFormat)) {
+    } else if (blankFollows && dcm::EqualsNoCase(keyword, dcm::keyword::kKonservierungFormat)) {
+        if (report != nullptr)
+            report->Version(block);
         InsertKonservierungsFormat(block);
         m_bBlockSeen = 1;
-    } else if (dcm::EqualsNoCase(keyword, dcm::keyword::kComment) && m_bBlockSeen == 0) {
+    } else if (blankFollows && dcm::EqualsNoCase(keyword, dcm::keyword::kComment) &&
+               m_bBlockSeen == 0) {
+        if (report != nullptr)
+            report->Comment(block);
         InsertKommentar(block);
+    } else if (report != nullptr) {
+        report->Skipped(block, false);
     }
     return S_OK;
 }
@@ -276,15 +363,14 @@ HRESULT DCMConverter::Export(const CString& strPath) const
 {
     try {
         auto stage = dcm::FileStage::kOpening;
-        dcm::DocumentIo::Export(*this, strPath, stage, nullptr);
+        dcm::DocumentIo::Export(*this, strPath, stage);
         return S_OK;
     } catch (...) {
         return E_UNEXPECTED;
     }
 }
 
-bool dcm::DocumentIo::Export(const DCMConverter& document, const CString& path, FileStage& stage,
-                             FindingList*)
+bool dcm::DocumentIo::Export(const DCMConverter& document, const CString& path, FileStage& stage)
 {
     stage = FileStage::kOpening;
     PravFile file(path, CFile::modeCreate | CFile::modeWrite);

@@ -2,13 +2,21 @@
 
 #include "dcm/converter/dcmconverter.h"
 #include "dcm/platform/cstring.h"
-#include "dcm/textfile/findings.h"
+#include "dcm/textfile/file_text.h"
+
+#include <cstddef>
+#include <list>
+#include <string_view>
+
+class PravFile;
 
 #include <tuple>
 
 /// Import and export of a document with what hosts do not see: how far they came, and why they
 /// failed.
 namespace dcm {
+
+class ImportReport;
 
 /// How far an import or export has come.
 enum class FileStage : unsigned char
@@ -38,13 +46,26 @@ struct DocumentIo
     }
 
     /// What the document's Import does; failures are raised. `stage` tells how far it came.
-    /// Nothing is reported when `findings` is null.
+    /// Nothing is reported when `report` is null.
     static void Import(DCMConverter& document, const CString& path, FileStage& stage,
-                       FindingList* findings);
+                       ImportReport* report);
     /// The same for Export. Returns false when the system does not answer for the open file:
     /// nothing is written then.
-    static bool Export(const DCMConverter& document, const CString& path, FileStage& stage,
-                       FindingList* findings);
+    static bool Export(const DCMConverter& document, const CString& path, FileStage& stage);
+
+    /// Reads one block; `report` may be null. With `keep` the report keeps the block in mind, which
+    /// must stay in the document.
+    static void Read(DCMConverter& document, FileBlock& block, ImportReport* report, bool keep);
+    /// Removes all blocks and keeps the rest.
+    static void DropBlocks(DCMConverter& document) noexcept;
+    /// Writes the header text, and the line of the version.
+    static void WriteHeader(const DCMConverter& document, PravFile& file);
+    static void WriteFormat(const DCMConverter& document, PravFile& file);
+    /// What `SetVersion` has set.
+    static double Version(const DCMConverter& document);
+    static const std::list<DCMStuetzstellenverteilung>& Distributions(const DCMConverter& document);
+    /// The keyword of the kind with this index.
+    static std::wstring_view KeywordOf(std::size_t kind);
 };
 
 } // namespace dcm

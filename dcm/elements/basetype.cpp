@@ -1,6 +1,7 @@
 #include "dcm/elements/basetype.h"
 
 #include "dcm/elements/block_io.h"
+#include "dcm/elements/block_reader.h"
 #include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/platform/text.h"
@@ -54,15 +55,15 @@ CString DCMBaseType::ExportFunktion(PravFile&) const
 }
 
 bool dcm::BlockIo::ReadAttribute(std::string_view keyword, std::string_view value,
-                                 std::string_view function, const FileText& text,
+                                 std::string_view function, const BlockReader& reader,
                                  DCMBaseType& block)
 {
     if (EqualsNoCase(keyword, keyword::kLangname))
-        block.m_strLangname = text.SharedWide(value);
+        block.m_strLangname = reader.Attribute(value);
     else if (EqualsNoCase(keyword, keyword::kDisplayname))
-        block.m_strDisplayname = text.SharedWide(value);
+        block.m_strDisplayname = reader.Attribute(value);
     else if (EqualsNoCase(keyword, keyword::kFunktion))
-        block.m_strFunction = text.SharedWide(function);
+        block.m_strFunction = reader.Attribute(function);
     else
         return false;
     return true;

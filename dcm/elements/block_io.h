@@ -14,6 +14,7 @@ class PravFile;
 
 namespace dcm {
 
+class BlockReader;
 struct CurveFields;
 struct DistributionFields;
 struct ListFields;
@@ -32,6 +33,11 @@ struct BlockIo
     /// Takes the lines of the file up to the next empty one; none where two empty lines meet.
     /// Returns false when no empty line follows. The block is valid until the file is opened anew.
     static bool Next(PravFile& file, FileBlock& block);
+    /// After the last block: adds what has no line feed to `block`, which has the lines before
+    /// that. Returns whether there was nothing to add.
+    static bool AddRest(PravFile& file, FileBlock& block);
+    /// The text of a file that was loaded.
+    static const FileText& TextOf(const PravFile& file);
 
     /// `Init` for the lines of a block. A failure leaves what was read before it.
     static HRESULT Read(const FileBlock& lines, DCMFestwert& block);
@@ -49,9 +55,11 @@ struct BlockIo
     static void Compose(const DCMKennfeld& block, FileTextBuilder& text);
 
     /// Stores `value` when `keyword` is LANGNAME or DISPLAYNAME, `function` when it is FUNKTION;
-    /// otherwise returns false. Both are parts of `text`.
+    /// otherwise returns false. Both are parts of the text of `reader`.
     static bool ReadAttribute(std::string_view keyword, std::string_view value,
-                              std::string_view function, const FileText& text, DCMBaseType& block);
+                              std::string_view function, const BlockReader& reader,
+                              DCMBaseType& block);
+
     /// Appends the lines of LANGNAME, DISPLAYNAME and FUNKTION.
     static void ComposeAttributes(const DCMBaseType& block, FileTextBuilder& text);
 

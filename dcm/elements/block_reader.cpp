@@ -48,9 +48,15 @@ bool BlockReader::Next(BlockLine& line)
             blank = SkipWord(blank + 1, end);
         if (blank < end) {
             line = {{start, blank}, {blank + 1, end}};
+            if (m_report != nullptr)
+                m_report->KeywordLine(m_next - 1, line.keyword, line.rest);
             return true;
         }
+        if (m_report != nullptr)
+            m_report->OtherLine(m_next - 1, bytes);
     }
+    if (m_report != nullptr)
+        m_report->End();
     return false;
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "dcm/elements/block_report.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/text.h"
 #include "dcm/textfile/file_text.h"
@@ -30,16 +31,52 @@ class BlockReader
 {
 public:
     /// The block must outlive the reader.
-    explicit BlockReader(const FileBlock& block) : m_block(block) {}
+    explicit BlockReader(const FileBlock& block) : m_block(block), m_report(block.Report()) {}
 
     /// Takes the next such line; false at the end of the block.
     bool Next(BlockLine& line);
 
     /// The block's text, which turns parts of a line into wide texts.
     const FileText& Text() const { return m_block.Text(); }
+    /// Who is told what the reader meets; null for nobody.
+    BlockReport* Report() const { return m_report; }
+    /// The wide form of what the line taken last sets: a name that is all of its rest or its first
+    /// word, an attribute or unit, or the name of a distribution.
+    CString Name(std::string_view part) const
+    {
+        if (m_report != nullptr)
+            m_report->Name(part);
+        return Text().Wide(part);
+    }
+    CString NameWord(std::string_view part) const
+    {
+        if (m_report != nullptr)
+            m_report->NameWord(part);
+        return Text().Wide(part);
+    }
+    CString Attribute(std::string_view part) const
+    {
+        if (m_report != nullptr)
+            m_report->Attribute(part);
+        return Text().SharedWide(part);
+    }
+    CString Reference(std::string_view part) const
+    {
+        if (m_report != nullptr)
+            m_report->Reference();
+        return Text().SharedWide(part);
+    }
+
+    /// Says that the line taken last has no keyword of the block's kind.
+    void UnknownLine() const
+    {
+        if (m_report != nullptr)
+            m_report->UnknownLine();
+    }
 
 private:
     const FileBlock& m_block;
+    BlockReport* m_report;
     std::size_t m_next = 0;
 };
 

@@ -2,6 +2,7 @@
 
 #include "dcm/elements/block_io.h"
 #include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_report.h"
 #include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
@@ -34,23 +35,35 @@ void AppendValueLine(dcm::FileTextBuilder& block, const VARIANT& value)
 
 /// Stores the text of a TEXT line. The words "true" and "false", in these letters only, are
 /// numbers.
-void ReadValueText(std::string_view part, const dcm::FileText& text, CComVariant& value)
+void ReadValueText(std::string_view part, const dcm::FileText& text, dcm::BlockReport* report,
+                   CComVariant& value)
 {
-    if (part == "true") {
-        value = 1.0;
-    } else if (part == "false") {
-        value = 0.0;
-    } else {
-        try {
-            value.SetText(text.Wide(dcm::TrimQuotes(dcm::TrimWhite(part))));
-        } catch (...) {
-            // The wide text or the value's copy of it: whichever has no memory, the value says so.
-            VariantClear(&value);
-            value.vt = VT_ERROR;
-            value.scode = E_OUTOFMEMORY;
-            throw;
-        }
+    const bool isTrue = part == "true";
+    if (isTrue || part == "false") {
+        if (report != nullptr)
+            report->TruthWord();
+        value = isTrue ? 1.0 : 0.0;
+        return;
     }
+    part = dcm::TrimQuotes(dcm::TrimWhite(part));
+    if (report != nullptr)
+        report->SingleText(part);
+    try {
+        value.SetText(text.Wide(part));
+    } catch (...) {
+        // The wide text or the value's copy of it: whichever has no memory, the value says so.
+        VariantClear(&value);
+        value.vt = VT_ERROR;
+        value.scode = E_OUTOFMEMORY;
+        throw;
+    }
+}
+
+double ReadValueNumber(std::string_view token, dcm::BlockReport* report)
+{
+    if (report != nullptr)
+        report->SingleNumber(token);
+    return dcm::ReadNumber(token);
 }
 
 } // namespace
@@ -74,16 +87,21 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwert& block)
         const std::string_view value = TrimQuotes(TrimWhite(line.rest));
         const std::string_view rest = TrimBlanks(value);
         if (line.Is(block.m_strKeyword))
-            block.SetName(text.Wide(rest));
-        else if (ReadAttribute(line.keyword, rest, rest, text, block))
+            block.SetName(reader.Name(rest));
+        else if (ReadAttribute(line.keyword, rest, rest, reader, block))
             continue;
         else if (line.Is(keyword::kEinheitW))
-            block.m_strUnit = text.SharedWide(rest);
+            block.m_strUnit = reader.Attribute(rest);
         else if (line.Is(keyword::kWert))
-            block.m_value = ReadNumber(rest);
+            block.m_value = ReadValueNumber(rest, reader.Report());
         else if (line.Is(keyword::kText))
-            ReadValueText(value, text, block.m_value);
+            ReadValueText(value, text, reader.Report(), block.m_value);
+        else
+            reader.UnknownLine();
     }
+    if (reader.Report() != nullptr && block.m_value.vt == VT_EMPTY)
+        reader.Report()->AddToBlock(FindingKind::kNoValue,
+                                    {L"The block has no value; it is written with 0.0."});
     return S_OK;
 }
 

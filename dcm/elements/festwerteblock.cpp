@@ -2,6 +2,7 @@
 
 #include "dcm/elements/block_io.h"
 #include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_report.h"
 #include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
@@ -51,11 +52,11 @@ bool AnotherTextFollows(std::string_view rest)
            rest[next + 1] != ' ';
 }
 
-void ReadNumbers(std::string_view rest, std::vector<double>& numbers)
+void ReadNumbers(std::string_view rest, dcm::BlockReport* report, std::vector<double>& numbers)
 {
     if (rest.empty())
         dcm::ThrowResult(E_INVALIDARG);
-    dcm::NumberReader reader(rest);
+    dcm::NumberReader reader(rest, report);
     std::array<double, dcm::kNumbersAtOnce> values;
     std::size_t count = values.size();
     while (count == values.size()) {
@@ -65,23 +66,29 @@ void ReadNumbers(std::string_view rest, std::vector<double>& numbers)
 }
 
 /// Reads a list of quoted texts.
-void ReadTexts(std::string_view rest, const dcm::FileText& text, std::list<CString>& texts)
+void ReadTexts(std::string_view rest, const dcm::FileText& text, dcm::BlockReport* report,
+               std::list<CString>& texts)
 {
+    const auto add = [&](std::string_view part) {
+        if (report != nullptr)
+            report->KeptText(part);
+        texts.push_back(text.Wide(part));
+    };
     while (!rest.empty()) {
         const std::size_t quotes = std::min(rest.find_first_not_of('"'), rest.size());
         rest.remove_prefix(quotes);
         if (rest.empty())
             break;
         if (quotes > 1 && AnotherTextFollows(rest)) {
-            texts.emplace_back();
+            add({});
         } else {
             const std::size_t end = FindClosingQuote(rest);
             if (end == rest.npos) {
                 // No quote closes the text: it runs to the end, without a final quote.
-                texts.push_back(text.Wide(rest.substr(0, rest.size() - rest.ends_with('"'))));
+                add(rest.substr(0, rest.size() - rest.ends_with('"')));
                 break;
             }
-            texts.push_back(text.Wide(rest.substr(0, end)));
+            add(rest.substr(0, end));
             rest.remove_prefix(end + 1);
         }
         rest.remove_prefix(std::min(rest.find_first_not_of(' '), rest.size()));
@@ -89,12 +96,19 @@ void ReadTexts(std::string_view rest, const dcm::FileText& text, std::list<CStri
 }
 
 /// Reads the texts of a line. Without quotes around all of it, the whole line is one text.
-void ReadTextLine(std::string_view rest, const dcm::FileText& text, std::list<CString>& texts)
+void ReadTextLine(std::string_view rest, const dcm::FileText& text, dcm::BlockReport* report,
+                  std::list<CString>& texts)
 {
-    if (IsQuoted(rest))
-        return ReadTexts(rest, text, texts);
-    const std::string quoted = '"' + std::string(rest) + '"';
-    ReadTexts(quoted, text, texts);
+    if (report != nullptr)
+        report->BeginTexts();
+    if (IsQuoted(rest)) {
+        ReadTexts(rest, text, report, texts);
+    } else {
+        const std::string quoted = '"' + std::string(rest) + '"';
+        ReadTexts(quoted, text, report, texts);
+    }
+    if (report != nullptr)
+        report->EndTexts();
 }
 
 /// Reads "X @ Y". The count of a list is not needed.
@@ -108,6 +122,30 @@ void ReadCounts(std::string_view counts, const dcm::FileText& text, std::int32_t
     x = dcm::ReadInteger(counts.substr(0, at - 1));
     const std::string_view rest = counts.substr(at + 1);
     y = rest.empty() ? 0 : dcm::ReadInteger(text.WithoutFirstCharacter(rest));
+}
+
+/// Compares the counts of the first line, `declared`, with what was read of them and with the
+/// values.
+void ReportValues(dcm::BlockReport& report, std::string_view declared,
+                  const DCMFestwerteblock& block)
+{
+    const std::size_t numbers = block.GetDoubleValues().size();
+    const std::size_t texts = block.GetStringValues().size();
+    const std::size_t values = numbers > 0 ? numbers : texts;
+    if (numbers > 0 && texts > 0)
+        report.AddToBlock(
+            dcm::FindingKind::kNumbersAndTexts,
+            {L"The block has numbers and texts; its ", texts, L" texts will not be written."});
+    const std::size_t at = declared.find('@');
+    if (at == declared.npos) {
+        report.CompareCount(declared, values, L"values");
+        return;
+    }
+    const std::int64_t x = block.GetXValueCount(), y = block.GetYValueCount();
+    const bool read = report.Count(dcm::TrimWhite(declared.substr(0, at)), x) &&
+                      report.Count(dcm::TrimWhite(declared.substr(at + 1)), y);
+    if (read && (x * y != static_cast<std::int64_t>(values) || (x == 0) != (y == 0)))
+        report.CountDiffers(x * y, values, L"values");
 }
 
 /// Appends the lines of values: the numbers, or the texts where there are none.
@@ -145,24 +183,31 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwerteblock& block)
 {
     const FileText& text = lines.Text();
     BlockReader reader(lines);
+    BlockReport* const report = reader.Report();
+    std::string_view declared;
     BlockLine line;
     while (reader.Next(line)) {
         // White space first, then blanks and quotes, for every line of the block.
         const std::string_view rest = TrimBlanksAndQuotes(TrimWhite(line.rest));
         if (line.Is(keyword::kFestwerteblock)) {
             std::string_view counts = rest;
-            block.SetName(text.Wide(TakeWord(counts)));
+            block.SetName(reader.NameWord(TakeWord(counts)));
             ReadCounts(counts, text, block.m_nXValueCount, block.m_nYValueCount);
-        } else if (ReadAttribute(line.keyword, rest, rest, text, block)) {
+            declared = counts;
+        } else if (ReadAttribute(line.keyword, rest, rest, reader, block)) {
             continue;
         } else if (line.Is(keyword::kEinheitW)) {
-            block.m_strUnit = text.SharedWide(rest);
+            block.m_strUnit = reader.Attribute(rest);
         } else if (line.Is(keyword::kWert)) {
-            ReadNumbers(rest, block.m_vecDoubleValues);
+            ReadNumbers(rest, report, block.m_vecDoubleValues);
         } else if (line.Is(keyword::kText)) {
-            ReadTextLine(TrimWhite(rest), text, block.m_listStringValues);
+            ReadTextLine(TrimWhite(rest), text, report, block.m_listStringValues);
+        } else {
+            reader.UnknownLine();
         }
     }
+    if (report != nullptr)
+        ReportValues(*report, declared, block);
     return S_OK;
 }
 
@@ -170,9 +215,9 @@ HRESULT DCMFestwerteblock::AddValues(CString& strRest)
 {
     const auto text = dcm::FileText::OfHost(strRest);
     if (IsQuoted(text.Bytes()))
-        ReadTexts(text.Bytes(), text, m_listStringValues);
+        ReadTexts(text.Bytes(), text, nullptr, m_listStringValues);
     else
-        ReadNumbers(text.Bytes(), m_vecDoubleValues);
+        ReadNumbers(text.Bytes(), nullptr, m_vecDoubleValues);
     strRest.Empty();
     return S_OK;
 }
@@ -181,7 +226,7 @@ HRESULT DCMFestwerteblock::AddStringValues(CString& strRest)
 {
     const auto text = dcm::FileText::OfHost(strRest);
     if (text.Bytes().starts_with('"'))
-        ReadTexts(text.Bytes(), text, m_listStringValues);
+        ReadTexts(text.Bytes(), text, nullptr, m_listStringValues);
     strRest.Empty();
     return S_OK;
 }

@@ -2,6 +2,7 @@
 
 #include "dcm/elements/block_io.h"
 #include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_report.h"
 #include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
@@ -23,6 +24,28 @@ std::array<dcm::PointTarget, 3>
 TargetsOf(const dcm::PointArray& axisX, const dcm::PointArray& axisY, const dcm::PointArray& values)
 {
     return {{{dcm::kValues, values}, {dcm::kAxisX, axisX}, {dcm::kAxisY, axisY}}};
+}
+
+/// Compares the numbers of points of both axes and of values.
+void ReportGrid(dcm::BlockReport& report, std::size_t x, std::size_t y, std::size_t values)
+{
+    const std::size_t wanted = x * y;
+    if (values < wanted)
+        report.AddToBlock(dcm::FindingKind::kIncompleteMap,
+                          {L"The map has ", values, L" values where its axes ask for ", wanted,
+                           L"; it will not be written."});
+    else if (values > wanted)
+        report.AddToBlock(dcm::FindingKind::kSurplusValues,
+                          {L"The map has ", values, L" values where its axes ask for ", wanted,
+                           L"; the others will not be written."});
+    if (x == 0 && y == 0)
+        report.AddToBlock(dcm::FindingKind::kEmptyMap,
+                          {L"The map has no axis points; it will not be written."});
+    if (const std::int64_t line = report.Rows().FirstMoved(x))
+        report.Add(dcm::FindingKind::kRowDiffers, dcm::SeverityOf(dcm::FindingKind::kRowDiffers),
+                   line,
+                   {L"The row does not have one value for each of ", x,
+                    L" points of X, so that values move to another row."});
 }
 
 /// Appends the X axis, then each Y axis point with its row; nothing when there are too few values.
@@ -67,38 +90,55 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMKennfeld& block)
         TargetsOf({block.m_vecAxisX, block.m_vtAxisXType}, {block.m_vecAxisY, block.m_vtAxisYType},
                   {block.m_vecValues, block.m_vtValueType});
     const FileText& text = lines.Text();
-    PointReader points(targets, text);
     BlockReader reader(lines);
+    BlockReport* const report = reader.Report();
+    PointReader points(targets, text, report);
+    std::string_view declaredX, declaredY;
     BlockLine line;
     while (reader.Next(line)) {
         // Most lines of a file are lines of points.
-        if (points.Read(line))
+        if (points.Read(line)) {
+            if (report != nullptr)
+                report->AfterPoints(block.m_vecAxisY.size(), block.m_vecValues.size());
             continue;
+        }
         if (line.Is(block.m_strKeyword)) {
             // The name and two counts. Where a word is missing, it is the first one.
             std::string_view rest = TrimWhite(line.rest);
-            block.SetName(text.Wide(TakeWord(rest)));
-            block.m_nAxisLengthX = ReadInteger(TakeWord(rest));
-            block.m_nAxisLengthY = ReadInteger(rest);
+            block.SetName(reader.NameWord(TakeWord(rest)));
+            declaredX = TakeWord(rest);
+            declaredY = rest;
+            block.m_nAxisLengthX = ReadInteger(declaredX);
+            block.m_nAxisLengthY = ReadInteger(declaredY);
             const std::int64_t values = std::int64_t{block.m_nAxisLengthX} * block.m_nAxisLengthY;
             ReservePoints({{block.m_vecAxisX, block.m_nAxisLengthX},
                            {block.m_vecAxisY, block.m_nAxisLengthY},
                            {block.m_vecValues, values}},
                           lines);
-        } else if (ReadAttribute(line.keyword, TrimBlanksAndQuotes(line.rest), line.rest, text,
+        } else if (ReadAttribute(line.keyword, TrimBlanksAndQuotes(line.rest), line.rest, reader,
                                  block)) {
             continue;
         } else if (line.Is(keyword::kEinheitX)) {
-            block.m_strUnitX = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+            block.m_strUnitX = reader.Attribute(TrimBlanksAndQuotes(line.rest));
         } else if (line.Is(keyword::kEinheitY)) {
-            block.m_strUnitY = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+            block.m_strUnitY = reader.Attribute(TrimBlanksAndQuotes(line.rest));
         } else if (line.Is(keyword::kEinheitW)) {
-            block.m_strUnitW = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+            block.m_strUnitW = reader.Attribute(TrimBlanksAndQuotes(line.rest));
         } else if (line.Is(keyword::kSstX)) {
-            block.m_strStuetzstellenverteilungX = text.SharedWide(TrimBlanks(line.rest));
+            block.m_strStuetzstellenverteilungX = reader.Reference(TrimBlanks(line.rest));
         } else if (line.Is(keyword::kSstY)) {
-            block.m_strStuetzstellenverteilungY = text.SharedWide(TrimBlanks(line.rest));
+            block.m_strStuetzstellenverteilungY = reader.Reference(TrimBlanks(line.rest));
+        } else {
+            reader.UnknownLine();
         }
+    }
+    if (report != nullptr) {
+        const std::size_t x = block.m_vecAxisX.size(), y = block.m_vecAxisY.size();
+        if (report->Count(declaredX, block.m_nAxisLengthX) && (x > 0 || !report->HasReferenceX()))
+            report->CompareCount(block.m_nAxisLengthX, x, L"points of X");
+        if (report->Count(declaredY, block.m_nAxisLengthY) && (y > 0 || !report->HasReferenceY()))
+            report->CompareCount(block.m_nAxisLengthY, y, L"points of Y");
+        ReportGrid(*report, x, y, block.m_vecValues.size());
     }
     return S_OK;
 }
@@ -109,7 +149,7 @@ HRESULT DCMKennfeld::AddValues(const CString& strRest, const CString& strKeyword
                                    {m_vecValues, m_vtValueType});
     const auto keyword = dcm::FileText::OfHost(strKeyword);
     const auto text = dcm::FileText::OfHost(strRest);
-    dcm::PointReader(targets, text).Read({keyword.Bytes(), text.Bytes()});
+    dcm::PointReader(targets, text, nullptr).Read({keyword.Bytes(), text.Bytes()});
     return S_OK;
 }
 

@@ -2,6 +2,7 @@
 
 #include "dcm/elements/block_io.h"
 #include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_report.h"
 #include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
@@ -21,6 +22,19 @@ std::array<dcm::PointTarget, 2> TargetsOf(std::vector<CComVariant>& axis, VARTYP
                                           std::vector<CComVariant>& values, VARTYPE& valueType)
 {
     return {{{dcm::kAxisX, {axis, axisType}}, {dcm::kValues, {values, valueType}}}};
+}
+
+/// Compares the count of the first line, `declared`, the points and the values. A curve may have
+/// the points of a distribution and none of its own.
+void ReportShape(dcm::BlockReport& report, std::string_view declared, std::int32_t count,
+                 std::size_t points, std::size_t values)
+{
+    const std::size_t expected = points == 0 && report.HasReferenceX() ? values : points;
+    if (report.Count(declared, count) && count != static_cast<std::int64_t>(expected))
+        report.CountDiffers(count, expected, L"points");
+    if (expected != values)
+        report.AddToBlock(dcm::FindingKind::kAxisAndValuesDiffer,
+                          {L"The curve has ", points, L" axis points and ", values, L" values."});
 }
 
 void AppendPointLines(dcm::FileTextBuilder& block, const std::vector<CComVariant>& axis,
@@ -53,8 +67,9 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMKennlinie& block)
     const auto targets =
         TargetsOf(block.m_vecAxis, block.m_vtAxisType, block.m_vecValues, block.m_vtValueType);
     const FileText& text = lines.Text();
-    PointReader points(targets, text);
     BlockReader reader(lines);
+    PointReader points(targets, text, reader.Report());
+    std::string_view declared;
     BlockLine line;
     while (reader.Next(line)) {
         // Most lines of a file are lines of points.
@@ -63,24 +78,32 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMKennlinie& block)
         if (line.Is(block.m_strKeyword)) {
             // The name and the count; a line of one word is the count.
             std::string_view rest = TrimWhite(line.rest);
-            block.SetName(text.Wide(TakeWord(rest)));
+            block.SetName(reader.NameWord(TakeWord(rest)));
+            declared = rest;
             block.m_nAxisLengthX = ReadInteger(rest);
             ReservePoints({{block.m_vecAxis, block.m_nAxisLengthX},
                            {block.m_vecValues, block.m_nAxisLengthX}},
                           lines);
-        } else if (ReadAttribute(line.keyword, TrimBlanksAndQuotes(line.rest), line.rest, text,
+        } else if (ReadAttribute(line.keyword, TrimBlanksAndQuotes(line.rest), line.rest, reader,
                                  block)) {
             continue;
         } else if (line.Is(keyword::kEinheitX)) {
-            block.m_strUnitX = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+            block.m_strUnitX = reader.Attribute(TrimBlanksAndQuotes(line.rest));
         } else if (line.Is(keyword::kEinheitW)) {
-            block.m_strUnitW = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+            block.m_strUnitW = reader.Attribute(TrimBlanksAndQuotes(line.rest));
         } else if (line.Is(keyword::kStTxY)) {
+            if (reader.Report() != nullptr)
+                reader.Report()->Rejected();
             return E_FAIL;
         } else if (line.Is(keyword::kSstX)) {
-            block.m_strStuetzstellenverteilung = text.SharedWide(TrimBlanks(line.rest));
+            block.m_strStuetzstellenverteilung = reader.Reference(TrimBlanks(line.rest));
+        } else {
+            reader.UnknownLine();
         }
     }
+    if (reader.Report() != nullptr)
+        ReportShape(*reader.Report(), declared, block.m_nAxisLengthX, block.m_vecAxis.size(),
+                    block.m_vecValues.size());
     return S_OK;
 }
 
@@ -89,7 +112,7 @@ HRESULT DCMKennlinie::AddValues(CString& strRest, const CString& strKeyword)
     const auto targets = TargetsOf(m_vecAxis, m_vtAxisType, m_vecValues, m_vtValueType);
     const auto keyword = dcm::FileText::OfHost(strKeyword);
     const auto text = dcm::FileText::OfHost(strRest);
-    dcm::PointReader(targets, text).Read({keyword.Bytes(), text.Bytes()});
+    dcm::PointReader(targets, text, nullptr).Read({keyword.Bytes(), text.Bytes()});
     strRest.Empty();
     return S_OK;
 }

@@ -1,5 +1,6 @@
 #include "dcm/elements/number.h"
 
+#include "dcm/elements/block_report.h"
 #include "dcm/elements/decimal.h"
 #include "dcm/elements/exact_decimal.h"
 #include "dcm/platform/text.h"
@@ -8,6 +9,7 @@
 #include <algorithm>
 #include <array>
 #include <bit>
+#include <cmath>
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
@@ -370,6 +372,41 @@ double ReadNumber(std::string_view token) noexcept
     return ReadKnownToken(piece.data(), piece.data() + token.size());
 }
 
+NumberFault FaultOf(std::string_view token, double value) noexcept
+{
+    token = TrimRight(TrimLeft(token, IsWhite), IsWhite);
+    if (std::isinf(value)) {
+        TakeSign(token);
+        return EqualsNoCase(token, kInfinityName) ? NumberFault::kNone : NumberFault::kOutOfRange;
+    }
+    TakeSign(token);
+    std::size_t digits = 0;
+    bool point = false;
+    std::size_t i = 0;
+    for (; i < token.size() && (IsDigit(token[i]) || (token[i] == '.' && !point)); ++i) {
+        point = point || token[i] == '.';
+        digits += IsDigit(token[i]) ? 1 : 0;
+    }
+    if (digits == 0) {
+        return NumberFault::kUnreadable;
+    }
+    std::string_view rest = token.substr(i);
+    if (token.substr(0, i) == "1." && !rest.empty() && rest[0] == '#') {
+        for (const auto name : {"QNAN"sv, "SNAN"sv, "IND"sv, "NAN"sv}) {
+            if (EqualsNoCase(rest.substr(1, name.size()), name)) {
+                return NumberFault::kNotANumber;
+            }
+        }
+    }
+    if (rest.starts_with('e') || rest.starts_with('E')) {
+        std::string_view exponent = rest.substr(1);
+        TakeSign(exponent);
+        const std::string_view after = TrimLeft(exponent, IsDigit);
+        rest = after.size() < exponent.size() ? after : rest;
+    }
+    return rest.empty() ? NumberFault::kNone : NumberFault::kCut;
+}
+
 std::size_t NumberReader::Next(std::span<double> values) noexcept
 {
     const char* at = m_at;
@@ -385,6 +422,9 @@ std::size_t NumberReader::Next(std::span<double> values) noexcept
         } else {
             last = std::find(at, end, ' ');
             values[count] = ReadKnownToken(at, last);
+            if (m_report != nullptr) {
+                m_report->Number({at, last}, values[count]);
+            }
         }
         at = last < end ? SkipWhite(last + 1, end) : nullptr;
     }

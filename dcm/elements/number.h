@@ -32,6 +32,25 @@ double ReadDecimal(std::string_view text) noexcept;
 /// what ReadDecimal reads.
 double ReadNumber(std::string_view token) noexcept;
 
+/// What is wrong with a token.
+enum class NumberFault : unsigned char
+{
+    kNone,
+    /// There is no number; 0 is read.
+    kUnreadable,
+    /// A number, and more text after it.
+    kCut,
+    /// A number too large for a double; infinity is read.
+    kOutOfRange,
+    /// The name of a not-a-number, of which only the leading 1 is read.
+    kNotANumber,
+};
+
+/// What is wrong with a token whose number is `value`.
+NumberFault FaultOf(std::string_view token, double value) noexcept;
+
+class BlockReport;
+
 /// How many numbers are read at once. More of them would not be faster.
 inline constexpr std::size_t kNumbersAtOnce = 16;
 
@@ -42,8 +61,10 @@ public:
     /// The text must outlive the reader. `kReadAhead` characters after it must be readable, and a
     /// number must not be able to go on with the first of them: texts of a file end before white
     /// space, a quote or a zero.
-    explicit NumberReader(std::string_view text) noexcept
-        : m_at(text.empty() ? nullptr : text.data()), m_end(text.data() + text.size())
+    /// Tokens that are no plain number are told to `report`, if that is not null.
+    explicit NumberReader(std::string_view text, BlockReport* report = nullptr) noexcept
+        : m_at(text.empty() ? nullptr : text.data()), m_end(text.data() + text.size()),
+          m_report(report)
     {}
 
     /// Reads the next numbers, as many as there is room for, and returns how many; there are fewer
@@ -56,6 +77,7 @@ private:
     /// The start of the next token, or null when there is none.
     const char* m_at;
     const char* m_end;
+    BlockReport* m_report;
 };
 
 /// The decimal integer at the start of `text`: white space, a sign, digits; what follows is

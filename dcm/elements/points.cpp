@@ -1,5 +1,6 @@
 #include "dcm/elements/points.h"
 
+#include "dcm/elements/block_report.h"
 #include "dcm/elements/number.h"
 #include "dcm/platform/text.h"
 #include "dcm/platform/word.h"
@@ -39,9 +40,9 @@ VARTYPE JoinType(VARTYPE type, CComVariant& point)
     return type;
 }
 
-void ReadNumbers(std::string_view rest, const PointArray& array)
+void ReadNumbers(std::string_view rest, const PointArray& array, BlockReport* report)
 {
-    NumberReader numbers(rest);
+    NumberReader numbers(rest, report);
     std::array<double, kNumbersAtOnce> values;
     std::size_t count = values.size();
     while (count == values.size()) {
@@ -58,11 +59,17 @@ void ReadNumbers(std::string_view rest, const PointArray& array)
 
 /// A text begins after an opening quote, which is any character that follows the text before it,
 /// and ends at the next quote or with the line.
-void ReadTexts(std::string_view rest, const FileText& text, const PointArray& array)
+void ReadTexts(std::string_view rest, const FileText& text, const PointArray& array,
+               BlockReport* report)
 {
     while (!rest.empty()) {
+        const bool opened = rest.starts_with('"');
         rest = text.WithoutFirstCharacter(rest);
         const std::size_t end = rest.find('"');
+        if (report != nullptr && !opened)
+            report->TextsAltered();
+        if (report != nullptr && end == rest.npos)
+            report->OpenQuote();
         AppendPoint(array, CComVariant(text.Wide(rest.substr(0, end))));
         rest = end == rest.npos ? std::string_view() : TrimWhite(rest.substr(end + 1));
     }
@@ -108,15 +115,23 @@ void ReservePoints(std::initializer_list<AnnouncedPoints> arrays, const FileBloc
 }
 
 void ReadPoints(std::string_view rest, const FileText& text, const PointArray* numbers,
-                const PointArray* texts)
+                const PointArray* texts, BlockReport* report)
 {
     rest = TrimWhite(rest);
-    if (rest.starts_with('"') && rest.ends_with('"')) {
-        if (texts != nullptr)
-            ReadTexts(rest, text, *texts);
-    } else if (numbers != nullptr) {
-        ReadNumbers(rest, *numbers);
+    const bool quoted = rest.starts_with('"') && rest.ends_with('"');
+    const PointArray* const array = quoted ? texts : numbers;
+    if (array == nullptr) {
+        if (report != nullptr && !rest.empty())
+            report->DroppedItems(quoted);
+        return;
     }
+    const bool mixed = array->type == VT_ERROR;
+    if (quoted)
+        ReadTexts(rest, text, *array, report);
+    else
+        ReadNumbers(rest, *array, report);
+    if (report != nullptr && !mixed && array->type == VT_ERROR)
+        report->MixedTypes();
 }
 
 bool PointReader::Read(const BlockLine& line)
@@ -136,7 +151,7 @@ bool PointReader::Read(const BlockLine& line)
     }
     if (m_last->numbers == nullptr && m_last->texts == nullptr)
         return false;
-    ReadPoints(line.rest, m_text, m_last->numbers, m_last->texts);
+    ReadPoints(line.rest, m_text, m_last->numbers, m_last->texts, m_report);
     return true;
 }
 

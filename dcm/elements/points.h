@@ -48,9 +48,9 @@ void ReservePoints(std::initializer_list<AnnouncedPoints> arrays, const FileBloc
 
 /// Reads the items of one point line, `rest`, which is a part of `text`: quoted texts when it
 /// begins and ends with a double quote, numbers otherwise. Items of a kind without an array are
-/// dropped.
+/// dropped. What the line gives cause for is told to `report`, if that is not null.
 void ReadPoints(std::string_view rest, const FileText& text, const PointArray* numbers,
-                const PointArray* texts);
+                const PointArray* texts, BlockReport* report);
 
 /// Replaces `target` by copies of the points, each text its own; leaves it as it was when memory
 /// runs out.
@@ -79,9 +79,9 @@ struct PointTarget
 class PointReader
 {
 public:
-    /// For lines of `text`. The text and the targets must outlive the reader.
-    PointReader(std::span<const PointTarget> targets, const FileText& text)
-        : m_targets(targets), m_text(text)
+    /// For lines of `text`; `report` may be null. The text and the targets must outlive the reader.
+    PointReader(std::span<const PointTarget> targets, const FileText& text, BlockReport* report)
+        : m_targets(targets), m_text(text), m_report(report)
     {}
     PointReader(const PointReader&) = delete;
     PointReader& operator=(const PointReader&) = delete;
@@ -110,6 +110,7 @@ private:
 
     std::span<const PointTarget> m_targets;
     const FileText& m_text;
+    BlockReport* m_report;
     /// Most lines have the keyword of the line before them, or of the last line with another one.
     Line m_lines[2];
     Line* m_last = m_lines;

@@ -2,6 +2,7 @@
 
 #include "dcm/elements/block_io.h"
 #include "dcm/elements/block_reader.h"
+#include "dcm/elements/block_report.h"
 #include "dcm/elements/block_writer.h"
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
@@ -36,23 +37,31 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMStuetzstellenverteilung& b
     const PointArray values{block.m_vecValues, block.m_vtValueType};
     const FileText& text = lines.Text();
     BlockReader reader(lines);
+    std::string_view declared;
     BlockLine line;
     while (reader.Next(line)) {
         if (line.Is(keyword::kStuetzstellenverteilung)) {
             std::string_view rest = TrimWhite(line.rest);
-            block.SetName(text.Wide(TakeWord(rest)));
+            block.SetName(reader.NameWord(TakeWord(rest)));
+            declared = rest;
             ReservePoints({{block.m_vecValues, ReadInteger(rest)}}, lines);
-        } else if (ReadAttribute(line.keyword, TrimBlanksAndQuotes(line.rest), line.rest, text,
+        } else if (ReadAttribute(line.keyword, TrimBlanksAndQuotes(line.rest), line.rest, reader,
                                  block)) {
             continue;
         } else if (line.Is(keyword::kEinheitX)) {
-            block.m_strUnit = text.SharedWide(TrimBlanksAndQuotes(line.rest));
+            block.m_strUnit = reader.Attribute(TrimBlanksAndQuotes(line.rest));
         } else if (line.Is(keyword::kStX) || line.Is(keyword::kStTxX)) {
-            ReadPoints(line.rest, text, &values, &values);
+            ReadPoints(line.rest, text, &values, &values, reader.Report());
         } else if (line.Is(keyword::kStTxY) || line.Is(keyword::kText)) {
+            if (reader.Report() != nullptr)
+                reader.Report()->Rejected();
             return E_FAIL;
+        } else {
+            reader.UnknownLine();
         }
     }
+    if (reader.Report() != nullptr)
+        reader.Report()->CompareCount(declared, block.m_vecValues.size(), L"points");
     return S_OK;
 }
 
@@ -60,7 +69,7 @@ HRESULT DCMStuetzstellenverteilung::AddValues(CString& strRest)
 {
     const dcm::PointArray values{m_vecValues, m_vtValueType};
     const auto text = dcm::FileText::OfHost(strRest);
-    dcm::ReadPoints(text.Bytes(), text, &values, &values);
+    dcm::ReadPoints(text.Bytes(), text, &values, &values, nullptr);
     strRest.Empty();
     return S_OK;
 }

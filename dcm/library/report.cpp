@@ -1,6 +1,8 @@
 #include "dcm/library/report.h"
 
 #include "dcm/converter/document_io.h"
+#include "dcm/converter/import_report.h"
+#include "dcm/library/read_back.h"
 #include "dcm/platform/cfile.h"
 #include "dcm/platform/codepage.h"
 #include "dcm/platform/null_device.h"
@@ -110,7 +112,8 @@ CFileException NoAnswer(const CString& path)
     return {CFileException::generic, 0, path};
 }
 
-/// Runs an import or export and reports the failure that ends it.
+/// Runs an import or export and reports the failure that ends it, unless that was done where it
+/// happened.
 template <class Work>
 HRESULT Run(FindingList& findings, Direction direction, Work work) noexcept
 {
@@ -121,10 +124,12 @@ HRESULT Run(FindingList& findings, Direction direction, Work work) noexcept
     } catch (const CFileException& error) {
         AddFileFailure(findings, stage, direction, error);
     } catch (const std::bad_alloc&) {
-        findings.Add(FindingKind::kOutOfMemory, Severity::kError, 0, {}, {L"Memory ran out."});
+        if (findings.CountOf(FindingKind::kOutOfMemory) == 0)
+            findings.Add(FindingKind::kOutOfMemory, Severity::kError, 0, {}, {L"Memory ran out."});
     } catch (...) {
-        findings.Add(FindingKind::kStopped, Severity::kError, 0, {},
-                     {L"The import ended at this block."});
+        if (findings.CountOf(FindingKind::kStopped) == 0)
+            findings.Add(FindingKind::kStopped, Severity::kError, 0, {},
+                         {L"The work ended early."});
     }
     return E_UNEXPECTED;
 }
@@ -181,7 +186,7 @@ Report::~Report() = default;
 const std::vector<Finding>& Report::Findings() const noexcept
 {
     static constinit const std::vector<Finding> none;
-    return m_content ? m_content->findings.List() : none;
+    return m_content ? m_content->findings.All() : none;
 }
 
 std::size_t Report::Count(Severity severity) const noexcept
@@ -194,7 +199,7 @@ std::size_t Report::Count(std::string_view id) const noexcept
     const auto* const found = std::ranges::lower_bound(kFindingIds, id);
     if (!m_content || found == kFindingIds.end() || *found != id)
         return 0;
-    return m_content->findings.Count(static_cast<FindingKind>(found - kFindingIds.begin()));
+    return m_content->findings.CountOf(static_cast<FindingKind>(found - kFindingIds.begin()));
 }
 
 std::size_t Report::Count() const noexcept
@@ -234,8 +239,9 @@ HRESULT Import(DCMConverter& document, const CString& path, Report& report)
 {
     ReportAccess::Empty(report);
     FindingList findings(report.Limit());
+    ImportReport blocks(findings);
     const HRESULT result = Run(findings, Direction::kImport, [&](FileStage& stage) {
-        DocumentIo::Import(document, path, stage, &findings);
+        DocumentIo::Import(document, path, stage, &blocks);
     });
     ReportAccess::Set(report, std::move(findings));
     return result;
@@ -246,7 +252,7 @@ HRESULT Export(const DCMConverter& document, const CString& path, Report& report
     ReportAccess::Empty(report);
     FindingList findings(report.Limit());
     const HRESULT result = Run(findings, Direction::kExport, [&](FileStage& stage) {
-        if (!DocumentIo::Export(document, path, stage, &findings))
+        if (!ExportAndReadBack(document, path, stage, findings))
             AddFileFailure(findings, stage, Direction::kExport, NoAnswer(path));
     });
     ReportAccess::Set(report, std::move(findings));
@@ -260,7 +266,7 @@ HRESULT Save(const DCMConverter& document, const CString& path, Report& report)
     const HRESULT result = Run(findings, Direction::kExport, [&](FileStage& stage) {
         ReplacementFile file(path);
         try {
-            if (!DocumentIo::Export(document, file.Path(), stage, &findings))
+            if (!ExportAndReadBack(document, file.Path(), stage, findings))
                 throw NoAnswer(path);
         } catch (const CFileException& error) {
             throw CFileException(error.m_cause, error.m_lOsError, path);

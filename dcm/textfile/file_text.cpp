@@ -2,6 +2,7 @@
 
 #include "dcm/platform/exception.h"
 #include "dcm/platform/thread_code_page.h"
+#include "dcm/textfile/utf8_look.h"
 
 #include <algorithm>
 #include <limits>
@@ -13,15 +14,20 @@ namespace dcm {
 FileText FileText::OfFile(TextBuffer content)
 {
     auto encoding = ThreadEncoding();
+    Origin origin;
     if (!encoding) {
         const std::string_view bytes = content.Bytes();
         const std::string utf8 = ThreadCodePageToUtf8(bytes.substr(0, bytes.find('\0')));
+        const Utf8Look look = LookAsUtf8(bytes.substr(0, bytes.find('\0')));
+        origin = {true, HasTextAfterZero(bytes),
+                  look.firstWide != bytes.npos && look.firstBad == bytes.npos};
         content = TextBuffer(utf8.size());
         std::ranges::copy(utf8, content.Data());
         content.EndAt(utf8.size());
         encoding = Encoding::kUtf8;
     }
     FileText text(std::move(content), *encoding);
+    text.m_origin = origin;
     text.m_shared = std::make_unique<SharedTexts>();
     return text;
 }
@@ -33,6 +39,12 @@ FileText FileText::OfHost(std::wstring_view text)
     const char* const end = Encode(text, encoding, buffer.Data());
     buffer.EndAt(static_cast<std::size_t>(end - buffer.Data()));
     return {std::move(buffer), encoding};
+}
+
+bool HasTextAfterZero(std::string_view bytes)
+{
+    bytes.remove_prefix(std::min(bytes.find('\0'), bytes.size()));
+    return std::ranges::any_of(bytes, [](char c) { return c != '\0' && !IsWhite(c); });
 }
 
 HostBlock::HostBlock(std::wstring_view text) : m_text(FileText::OfHost(text))

@@ -2,6 +2,7 @@
 
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/encoding.h"
+#include "dcm/platform/text.h"
 #include "dcm/platform/word.h"
 #include "dcm/textfile/shared_texts.h"
 
@@ -56,6 +57,16 @@ public:
     static FileText OfHost(std::wstring_view text);
 
     std::string_view Bytes() const { return m_buffer.Bytes(); }
+    Encoding EncodingOfBytes() const { return m_encoding; }
+    /// What a conversion leaves no trace of.
+    struct Origin
+    {
+        /// Whether the text was converted by the system. The rest is told only then.
+        bool converted = false;
+        bool textAfterZero = false;
+        bool looksLikeUtf8 = false;
+    };
+    const Origin& OriginOfBytes() const { return m_origin; }
 
     /// The wide form of a part of the text, or of other bytes in its encoding. Bytes that are no
     /// character in UTF-8 become U+FFFD.
@@ -83,6 +94,7 @@ private:
 
     TextBuffer m_buffer;
     Encoding m_encoding = Encoding::kUtf8;
+    Origin m_origin;
     /// None for a text of the host, which is a single block.
     std::unique_ptr<SharedTexts> m_shared;
 };
@@ -96,6 +108,17 @@ inline bool TakeLine(std::string_view& rest, std::string_view& line)
         return false;
     line = {rest.data(), lineFeed};
     rest.remove_prefix(line.size() + 1);
+    return true;
+}
+
+class BlockReport;
+
+/// The same for a line of a file, which ends before its carriage returns.
+inline bool TakeFileLine(std::string_view& rest, std::string_view& line)
+{
+    if (!TakeLine(rest, line))
+        return false;
+    line = TrimRight(line, [](char c) { return c == '\r'; });
     return true;
 }
 
@@ -117,6 +140,10 @@ public:
         const auto begin = static_cast<std::uint32_t>(line.data() - m_text->Bytes().data());
         m_lines.push_back({begin, begin + static_cast<std::uint32_t>(line.size())});
     }
+
+    /// Who is told what the readers of the block meet; null for nobody.
+    BlockReport* Report() const { return m_report; }
+    void SetReport(BlockReport* report) { m_report = report; }
 
     /// The text that the lines are part of.
     const FileText& Text() const { return *m_text; }
@@ -146,9 +173,26 @@ private:
     };
 
     const FileText* m_text = nullptr;
+    BlockReport* m_report = nullptr;
     std::int32_t m_firstNumber = 1;
     std::vector<Span> m_lines;
 };
+
+/// Takes the lines up to the next empty one off `rest`, the end of the text that the block was
+/// begun for. Returns false when no empty line follows: `rest` is then what has no line feed.
+inline bool TakeBlock(std::string_view& rest, FileBlock& block)
+{
+    std::string_view line;
+    while (TakeFileLine(rest, line)) {
+        if (line.empty())
+            return true;
+        block.AddLine(line);
+    }
+    return false;
+}
+
+/// Whether anything but zeros and white space follows the first zero.
+bool HasTextAfterZero(std::string_view bytes);
 
 /// A block's text that comes from the host: text after the last line feed is not read, and a text
 /// that begins with a line feed has no lines.

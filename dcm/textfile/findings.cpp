@@ -1,84 +1,131 @@
 #include "dcm/textfile/findings.h"
 
 #include <algorithm>
+#include <string>
 #include <utility>
 
 namespace dcm {
 
-constexpr std::array<std::string_view, kFindingKinds> kFindingIds = {
-    "axis-and-values-differ",
-    "blank-separator",
-    "block-in-comment",
-    "block-inside-block",
-    "byte-order-mark",
-    "cannot-open",
-    "cannot-read",
-    "cannot-write",
-    "character-replaced",
-    "count-differs",
-    "count-not-read",
-    "digits-dropped",
-    "distribution-differs",
-    "dropped-comment",
-    "duplicate-name",
-    "empty-map",
-    "empty-text-dropped",
-    "incomplete-map",
-    "looks-like-utf-8",
-    "lost-nan",
-    "missing-end",
-    "mixed-types",
-    "no-line-end",
-    "no-name",
-    "no-value",
-    "not-in-code-page",
-    "number-cut",
-    "numbers-among-texts",
-    "numbers-and-texts",
-    "open-quote",
-    "out-of-memory",
-    "out-of-range",
-    "reference-not-written",
-    "rejected-block",
-    "repeated-line",
-    "row-differs",
-    "stopped",
-    "surplus-values",
-    "tab-after-keyword",
-    "text-after-end",
-    "text-after-zero",
-    "text-altered",
-    "text-among-numbers",
-    "text-trimmed",
-    "truth-word",
-    "unfinished-block",
-    "unknown-block",
-    "unknown-distribution",
-    "unknown-line",
-    "unreadable-number",
-    "value-not-written",
-    "variant-line",
-    "version-not-kept",
-};
-static_assert(std::ranges::is_sorted(kFindingIds));
-static_assert(!kFindingIds.back().empty());
+namespace {
 
-void FindingList::Add(FindingKind kind, Severity severity, std::int64_t line, const CString& block,
-                      std::initializer_list<std::wstring_view> message) noexcept
+constexpr struct
 {
-    ++m_bySeverity[static_cast<std::size_t>(severity)];
-    const auto index = static_cast<std::size_t>(kind);
-    if (++m_counts[index] > m_limit) {
-        m_incomplete = true;
+    std::string_view id;
+    Severity severity;
+} kKinds[] = {
+    {"axis-and-values-differ", Severity::kWarning},
+    {"blank-separator", Severity::kError},
+    {"block-in-comment", Severity::kError},
+    {"block-inside-block", Severity::kError},
+    {"byte-order-mark", Severity::kNote},
+    {"cannot-open", Severity::kError},
+    {"cannot-read", Severity::kError},
+    {"cannot-write", Severity::kError},
+    {"character-replaced", Severity::kError},
+    {"count-differs", Severity::kWarning},
+    {"count-not-read", Severity::kError},
+    {"digits-dropped", Severity::kWarning},
+    {"distribution-differs", Severity::kWarning},
+    {"dropped-comment", Severity::kNote},
+    {"duplicate-name", Severity::kNote},
+    {"empty-map", Severity::kWarning},
+    {"empty-text-dropped", Severity::kError},
+    {"incomplete-map", Severity::kWarning},
+    {"looks-like-utf-8", Severity::kWarning},
+    {"lost-nan", Severity::kError},
+    {"missing-end", Severity::kWarning},
+    {"mixed-types", Severity::kError},
+    {"no-line-end", Severity::kNote},
+    {"no-name", Severity::kError},
+    {"no-value", Severity::kWarning},
+    {"not-in-code-page", Severity::kError},
+    {"number-cut", Severity::kError},
+    {"numbers-among-texts", Severity::kError},
+    {"numbers-and-texts", Severity::kWarning},
+    {"open-quote", Severity::kWarning},
+    {"out-of-memory", Severity::kError},
+    {"out-of-range", Severity::kError},
+    {"reference-not-written", Severity::kError},
+    {"rejected-block", Severity::kError},
+    {"repeated-line", Severity::kError},
+    {"row-differs", Severity::kError},
+    {"stopped", Severity::kError},
+    {"surplus-values", Severity::kWarning},
+    {"tab-after-keyword", Severity::kError},
+    {"text-after-end", Severity::kWarning},
+    {"text-after-zero", Severity::kError},
+    {"text-altered", Severity::kWarning},
+    {"text-among-numbers", Severity::kError},
+    {"text-trimmed", Severity::kWarning},
+    {"truth-word", Severity::kWarning},
+    {"unfinished-block", Severity::kError},
+    {"unknown-block", Severity::kError},
+    {"unknown-distribution", Severity::kNote},
+    {"unknown-line", Severity::kError},
+    {"unreadable-number", Severity::kError},
+    {"value-not-written", Severity::kError},
+    {"variant-line", Severity::kNote},
+    {"version-not-kept", Severity::kNote},
+};
+static_assert(std::size(kKinds) == kFindingKinds);
+
+constexpr auto IdsOfKinds()
+{
+    std::array<std::string_view, kFindingKinds> ids;
+    std::ranges::transform(kKinds, ids.begin(), [](const auto& kind) { return kind.id; });
+    return ids;
+}
+
+} // namespace
+
+constexpr std::array<std::string_view, kFindingKinds> kFindingIds = IdsOfKinds();
+static_assert(std::ranges::is_sorted(kFindingIds));
+
+Severity SeverityOf(FindingKind kind) noexcept
+{
+    return kKinds[static_cast<std::size_t>(kind)].severity;
+}
+
+void MessagePart::AppendTo(CString& message) const
+{
+    if (m_type == Type::kNumber) {
+        message.Append(std::to_wstring(m_number));
         return;
     }
+    if (m_type == Type::kWords) {
+        message.Append(m_wide);
+        return;
+    }
+    // No character takes more than four bytes.
+    std::wstring shown = m_type == Type::kQuoted
+                             ? std::wstring(m_wide.substr(0, kQuotedMax + 1))
+                             : std::wstring(m_text->Wide(m_bytes.substr(0, 4 * kQuotedMax + 4)));
+    const bool cut = shown.size() > kQuotedMax;
+    shown.resize(std::min(shown.size(), kQuotedMax));
+    std::ranges::replace_if(
+        shown, [](wchar_t c) { return (c >= 0 && c < L' ') || c == 0x7F; }, L'.');
+    message.Append(L"\"").Append(shown).Append(cut ? L"...\"" : L"\"");
+}
+
+bool FindingList::Count(FindingKind kind, Severity severity) noexcept
+{
+    ++m_bySeverity[static_cast<std::size_t>(severity)];
+    const bool listed = ++m_counts[static_cast<std::size_t>(kind)] <= m_limit;
+    m_incomplete = m_incomplete || !listed;
+    return listed;
+}
+
+void FindingList::List(FindingKind kind, Severity severity, std::int64_t line, const CString& block,
+                       std::initializer_list<MessagePart> message) noexcept
+{
     try {
         CString text;
-        for (const std::wstring_view piece : message)
-            text.Append(piece);
-        m_list.push_back({severity, kFindingIds[index], line, block, std::move(text)});
+        for (const MessagePart& part : message)
+            part.AppendTo(text);
+        const std::string_view id = kFindingIds[static_cast<std::size_t>(kind)];
+        m_list.push_back({severity, id, line, block, std::move(text)});
     } catch (...) {
-        m_incomplete = true;
+        Miss();
     }
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "dcm/platform/cstring.h"
+#include "dcm/textfile/file_text.h"
 #include "dcm/textfile/finding.h"
 
 #include <array>
@@ -77,6 +78,58 @@ inline constexpr std::size_t kFindingKinds =
 /// The ids of the kinds, in their order.
 extern const std::array<std::string_view, kFindingKinds> kFindingIds;
 
+/// The severity that findings of the kind have as a rule.
+Severity SeverityOf(FindingKind kind) noexcept;
+
+/// The most characters of a text that a message quotes. Three such texts fit into a message.
+inline constexpr std::size_t kQuotedMax = 64;
+
+/// A part of a message: words, a number, or a text of the file or host, which is shown in double
+/// quotes, without control characters and cut to `kQuotedMax`.
+class MessagePart
+{
+public:
+    MessagePart(const wchar_t* words) : m_wide(words) {}
+    MessagePart(std::wstring_view words) : m_wide(words) {}
+    MessagePart(const CString& words) : m_wide(words) {}
+    MessagePart(std::int64_t number) : m_type(Type::kNumber), m_number(number) {}
+    MessagePart(std::size_t number) : MessagePart(static_cast<std::int64_t>(number)) {}
+
+    /// A text of the host.
+    static MessagePart Quoted(std::wstring_view text)
+    {
+        MessagePart part(text);
+        part.m_type = Type::kQuoted;
+        return part;
+    }
+    /// A part of `text`, which is decoded when the message is made.
+    static MessagePart Quoted(std::string_view part, const FileText& text)
+    {
+        MessagePart result(L"");
+        result.m_type = Type::kQuotedBytes;
+        result.m_bytes = part;
+        result.m_text = &text;
+        return result;
+    }
+
+    void AppendTo(CString& message) const;
+
+private:
+    enum class Type : unsigned char
+    {
+        kWords,
+        kNumber,
+        kQuoted,
+        kQuotedBytes,
+    };
+
+    Type m_type = Type::kWords;
+    std::wstring_view m_wide;
+    std::string_view m_bytes;
+    const FileText* m_text = nullptr;
+    std::int64_t m_number = 0;
+};
+
 /// The findings of one import or export. Nothing here throws: a finding for which there is no
 /// memory is counted and not listed.
 class FindingList
@@ -85,15 +138,26 @@ public:
     /// Lists up to `limit` findings of each kind.
     explicit FindingList(std::size_t limit) noexcept : m_limit(limit) {}
 
-    /// Adds a finding; line 0 for none. The message is made of the pieces only when it is listed.
+    /// Counts a finding; returns whether it is to be listed too.
+    bool Count(FindingKind kind, Severity severity) noexcept;
+    /// Lists a finding that was counted; line 0 for none.
+    void List(FindingKind kind, Severity severity, std::int64_t line, const CString& block,
+              std::initializer_list<MessagePart> message) noexcept;
+    /// Both.
     void Add(FindingKind kind, Severity severity, std::int64_t line, const CString& block,
-             std::initializer_list<std::wstring_view> message) noexcept;
+             std::initializer_list<MessagePart> message) noexcept
+    {
+        if (Count(kind, severity))
+            List(kind, severity, line, block, message);
+    }
+    /// Says that a finding could not be listed.
+    void Miss() noexcept { m_incomplete = true; }
     /// Sorts the list by lines, findings of equal lines in the order in which they were added, and
     /// those without a line last.
     void Sort() noexcept;
 
-    const std::vector<Finding>& List() const noexcept { return m_list; }
-    std::size_t Count(FindingKind kind) const noexcept
+    const std::vector<Finding>& All() const noexcept { return m_list; }
+    std::size_t CountOf(FindingKind kind) const noexcept
     {
         return m_counts[static_cast<std::size_t>(kind)];
     }

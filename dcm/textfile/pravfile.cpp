@@ -15,15 +15,6 @@ namespace {
 
 constexpr ULONGLONG kSizeMax = std::numeric_limits<std::int32_t>::max();
 
-/// Takes the next line without its line feed and the carriage returns before that.
-bool TakeFileLine(std::string_view& rest, std::string_view& line)
-{
-    if (!dcm::TakeLine(rest, line))
-        return false;
-    line = dcm::TrimRight(line, [](char c) { return c == '\r'; });
-    return true;
-}
-
 } // namespace
 
 /// The text of the open file and how much of it has been handed out.
@@ -97,7 +88,7 @@ int PravFile::ReadLine(CString& line)
         return 0;
     std::string_view rest = m_pContent->Rest();
     std::string_view bytes;
-    if (!TakeFileLine(rest, bytes))
+    if (!dcm::TakeFileLine(rest, bytes))
         return 0;
     m_pContent->SetRest(rest);
     ++m_pContent->m_nLine;
@@ -113,13 +104,25 @@ bool PravFile::ReadBlock(dcm::FileBlock& block)
         return false;
     block.Begin(m_pContent->m_strContent, m_pContent->m_nLine);
     std::string_view rest = m_pContent->Rest();
-    std::string_view line;
-    bool more = false;
-    while ((more = TakeFileLine(rest, line)) && !line.empty())
-        block.AddLine(line);
+    const bool more = dcm::TakeBlock(rest, block);
     m_pContent->SetRest(rest);
     m_pContent->m_nLine = block.LineNumber(block.LineCount()) + (more ? 1 : 0);
     return more;
+}
+
+/// Adds the text after the last line feed to the lines before it; returns whether there is none.
+bool PravFile::AddRest(dcm::FileBlock& block) const
+{
+    const std::string_view rest = m_pContent->Rest();
+    const std::string_view line = rest.substr(0, rest.find('\0'));
+    if (!line.empty())
+        block.AddLine(line);
+    return line.empty();
+}
+
+const dcm::FileText& PravFile::Text() const
+{
+    return m_pContent->m_strContent;
 }
 
 int PravFile::WriteText(const CString& text)

@@ -10,6 +10,7 @@
 namespace dcm {
 struct BlockIo;
 class FileBlock;
+class FileText;
 } // namespace dcm
 
 /// A text file in the ANSI code page: read as a whole and handed out line by line, or written text
@@ -50,6 +51,8 @@ private:
     struct Content;
 
     bool ReadBlock(dcm::FileBlock& block);
+    bool AddRest(dcm::FileBlock& block) const;
+    const dcm::FileText& Text() const;
 
     std::unique_ptr<Content> m_pContent;
 };
