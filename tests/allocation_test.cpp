@@ -126,6 +126,47 @@ TEST(Allocation, FailureIsTheResultOfImportAndExport)
     ASSERT_TRUE(dcm::SetThreadCodePage(1252));
 }
 
+TEST(Allocation, FailureOfAReportLeavesTheWorkAsItIs)
+{
+    const Folder folder;
+    const CString in = folder / L"in", out = folder / L"out", plain = folder / L"plain";
+    WriteBytes(in, ReadBytes(CString(DCM_ALL_KINDS)) + "FESTWERT A\n WERT 720,5\n\n");
+    DCMConverter all;
+    ASSERT_EQ(all.Import(in), S_OK);
+    const std::string content = ExportBytes(all, plain);
+    bool failed = true;
+    for (long number = 1; failed; ++number) {
+        SCOPED_TRACE(number);
+        DCMConverter document;
+        dcm::Report report;
+        untilFailure = number;
+        const HRESULT result = dcm::Import(document, in, report);
+        failed = untilFailure <= 0;
+        untilFailure = 0;
+        if (result == S_OK) {
+            EXPECT_EQ(ExportBytes(document, plain), content);
+        }
+        // Sorting can do without the memory that it asks for.
+        const bool whole = result == S_OK && !report.Incomplete();
+        EXPECT_TRUE(failed || whole);
+        EXPECT_TRUE(!whole || report.Findings().size() == 1);
+        EXPECT_GT(report.Count(dcm::Severity::kError), 0U);
+    }
+    failed = true;
+    for (long number = 1; failed; ++number) {
+        SCOPED_TRACE(number);
+        dcm::Report report;
+        untilFailure = number;
+        const HRESULT result = dcm::Export(all, out, report);
+        failed = untilFailure <= 0;
+        untilFailure = 0;
+        if (result == S_OK) {
+            EXPECT_EQ(ReadBytes(out), content);
+        }
+        EXPECT_EQ(failed, result != S_OK || report.Incomplete());
+    }
+}
+
 TEST(Allocation, FailureIsRaisedByTheCallsOfABlock)
 {
     static const Folder folder;

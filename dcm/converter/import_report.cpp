@@ -76,9 +76,11 @@ void ImportReport::Keep(const DCMBaseType& stored, std::size_t kind, std::int64_
 {
     try {
         const std::size_t hash = std::hash<std::wstring_view>()(stored.GetName()) + kind;
-        m_kept.push_back({hash, &stored, static_cast<std::int32_t>(line),
-                          static_cast<std::int32_t>(variantLine), static_cast<unsigned char>(kind),
-                          references});
+        if (!m_kept)
+            m_kept.emplace();
+        m_kept->push_back({hash, &stored, static_cast<std::int32_t>(line),
+                           static_cast<std::int32_t>(variantLine), static_cast<unsigned char>(kind),
+                           references});
     } catch (...) {
         m_findings.Miss();
     }
@@ -102,11 +104,13 @@ void ImportReport::End(const DCMConverter& document) noexcept
     if (m_maybeUtf8 && !m_notUtf8)
         Add(FindingKind::kLooksLikeUtf8, Severity::kWarning, m_utf8Line, {},
             {L"The file looks like UTF-8, but is read in another code page."});
+    if (!m_kept)
+        return;
     try {
         const auto refers = [](const Kept& kept) { return kept.references; };
-        if (std::ranges::any_of(m_kept, refers)) {
+        if (std::ranges::any_of(*m_kept, refers)) {
             SetDistributions(document);
-            for (const Kept& kept : m_kept)
+            for (const Kept& kept : *m_kept)
                 if (kept.references)
                     CompareAxes(*kept.block, kept.kind, kept.line);
         }
@@ -118,11 +122,11 @@ void ImportReport::End(const DCMConverter& document) noexcept
 
 void ImportReport::CompareNames()
 {
-    std::ranges::sort(m_kept, [](const Kept& a, const Kept& b) {
+    std::ranges::sort(*m_kept, [](const Kept& a, const Kept& b) {
         return a.hash != b.hash ? a.hash < b.hash : a.line < b.line;
     });
-    for (auto group = m_kept.begin(); group != m_kept.end();) {
-        const auto end = std::find_if(group, m_kept.end(),
+    for (auto group = m_kept->begin(); group != m_kept->end();) {
+        const auto end = std::find_if(group, m_kept->end(),
                                       [&](const Kept& kept) { return kept.hash != group->hash; });
         const bool repeats = end - group > 1;
         for (auto kept = group; kept != end; ++kept) {

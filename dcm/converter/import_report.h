@@ -10,6 +10,7 @@
 #include <cstdint>
 #include <deque>
 #include <initializer_list>
+#include <optional>
 #include <string_view>
 #include <unordered_map>
 #include <vector>
@@ -71,7 +72,8 @@ private:
 
     FindingList& m_findings;
     BlockReport m_block;
-    std::deque<Kept> m_kept;
+    /// Made with the first block, since an empty one takes memory too.
+    std::optional<std::deque<Kept>> m_kept;
     std::unordered_map<std::wstring_view, const DCMStuetzstellenverteilung*> m_distributions;
     /// Whether bytes were met that are no UTF-8, and the line of the first that may be.
     bool m_notUtf8 = false;
