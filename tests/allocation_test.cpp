@@ -130,7 +130,7 @@ TEST(Allocation, FailureOfAReportLeavesTheWorkAsItIs)
 {
     const Folder folder;
     const CString in = folder / L"in", out = folder / L"out", plain = folder / L"plain";
-    WriteBytes(in, ReadBytes(CString(DCM_ALL_KINDS)) + "FESTWERT A\n WERT 720,5\n\n");
+    WriteBytes(in, ReadBytes(CString(DCM_ALL_KINDS)) + "FESTWERT A\n WERT 720,5\nEND\n\n");
     DCMConverter all;
     ASSERT_EQ(all.Import(in), S_OK);
     const std::string content = ExportBytes(all, plain);
