@@ -25,22 +25,74 @@ using Indices = std::vector<std::size_t>;
 
 // ---- Pairs of parameters ----------------------------------------------------------------------
 
-struct Key
+bool HaveSameKey(const Parameter& a, const Parameter& b)
 {
-    Kind kind;
-    std::wstring_view name;
+    return a.kind == b.kind && a.name == b.name;
+}
 
-    explicit Key(const Parameter& parameter) : kind(parameter.kind), name(parameter.name) {}
-    bool operator==(const Key&) const = default;
-};
-
-struct HashOfKey
+std::size_t HashOfKey(const Parameter& parameter)
 {
-    std::size_t operator()(const Key& key) const noexcept
+    return std::hash<std::wstring_view>()(parameter.name) +
+           static_cast<std::size_t>(parameter.kind);
+}
+
+/// Finds parameters by kind and name: a table of hashes without pointers, since most of the time of
+/// a comparison goes into waiting for memory.
+class ParameterTable
+{
+public:
+    /// For the parameters from `first` on, which must outlive the table.
+    ParameterTable(std::span<const Parameter> parameters, std::size_t first)
+        : m_parameters(parameters), m_slots(std::bit_ceil(2 * (parameters.size() - first))),
+          m_following(parameters.size(), kNoIndex)
     {
-        return std::hash<std::wstring_view>()(key.name) * kKinds.size() +
-               static_cast<std::size_t>(key.kind);
+        // From the last to the first, so that each one finds those that follow it.
+        for (std::size_t i = parameters.size(); i-- > first;) {
+            Slot& slot = Find(parameters[i]);
+            if (slot.owner == kNoIndex)
+                slot.owner = i;
+            m_following[i] = std::exchange(slot.next, i);
+        }
     }
+
+    /// The index of the next parameter of this kind and name; `kNoIndex` when there is none left.
+    std::size_t Take(const Parameter& parameter)
+    {
+        Slot& slot = Find(parameter);
+        if (slot.next == kNoIndex)
+            return kNoIndex;
+        return std::exchange(slot.next, m_following[slot.next]);
+    }
+
+private:
+    struct Slot
+    {
+        std::size_t hash = 0;
+        /// A parameter with the kind and name of the slot; `kNoIndex` for a free slot.
+        std::size_t owner = kNoIndex;
+        std::size_t next = kNoIndex;
+    };
+
+    /// The slot of the kind and name, or a free one for them.
+    Slot& Find(const Parameter& parameter)
+    {
+        const std::size_t hash = HashOfKey(parameter);
+        std::size_t at = hash;
+        while (true) {
+            Slot& slot = m_slots[at++ & (m_slots.size() - 1)];
+            if (slot.owner == kNoIndex) {
+                slot.hash = hash;
+                return slot;
+            }
+            if (slot.hash == hash && HaveSameKey(m_parameters[slot.owner], parameter))
+                return slot;
+        }
+    }
+
+    std::span<const Parameter> m_parameters;
+    std::vector<Slot> m_slots;
+    /// The next parameter of the same kind and name.
+    Indices m_following;
 };
 
 /// For each old parameter the index of the new one that it is paired with, or `kNoIndex`.
@@ -50,27 +102,15 @@ Indices Pairs(std::span<const Parameter> oldParameters, std::span<const Paramete
     // Lists that begin alike need no table for their beginning.
     std::size_t first = 0;
     const std::size_t shorter = std::min(oldParameters.size(), newParameters.size());
-    while (first < shorter && Key(oldParameters[first]) == Key(newParameters[first])) {
+    while (first < shorter && HaveSameKey(oldParameters[first], newParameters[first])) {
         pairs[first] = first;
         ++first;
     }
     if (first == shorter)
         return pairs;
-    // The first new parameter of each key, and the next of the same key for each one.
-    std::unordered_map<Key, std::size_t, HashOfKey> firsts(newParameters.size() - first);
-    Indices nexts(newParameters.size(), kNoIndex);
-    for (std::size_t i = newParameters.size(); i-- > first;) {
-        const auto [at, fresh] = firsts.try_emplace(Key(newParameters[i]), i);
-        if (!fresh)
-            nexts[i] = std::exchange(at->second, i);
-    }
-    for (std::size_t i = first; i < oldParameters.size(); ++i) {
-        const auto at = firsts.find(Key(oldParameters[i]));
-        if (at != firsts.end() && at->second != kNoIndex) {
-            pairs[i] = at->second;
-            at->second = nexts[at->second];
-        }
-    }
+    ParameterTable table(newParameters, first);
+    for (std::size_t i = first; i < oldParameters.size(); ++i)
+        pairs[i] = table.Take(oldParameters[i]);
     return pairs;
 }
 
