@@ -241,6 +241,7 @@ TEST(CodePages, ConvertAsTheirCasesSay)
     EXPECT_FALSE(dcm::SetThreadCodePage(28607) || dcm::SetThreadCodePage(4711));
     EXPECT_TRUE(dcm::SetThreadCodePage(65001));
     std::thread([] { dcm::SetThreadCodePage(1252); }).join();
+    EXPECT_EQ(dcm::ThreadCodePage(), 65001U);
     const std::wstring half(1, static_cast<wchar_t>(0xD800));
     EXPECT_EQ(Narrow(L"\u00B5" + half), "\xC2\xB5\xEF\xBF\xBD") << "each thread has its own page";
     EXPECT_TRUE(dcm::SetThreadCodePage(1252));

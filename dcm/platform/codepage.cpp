@@ -17,11 +17,6 @@ constexpr unsigned kUtf8Identifier = 65001;
 /// The code page that the thread chose; 0 until it does.
 thread_local unsigned chosenCodePage = 0;
 
-unsigned ThreadCodePage()
-{
-    return chosenCodePage != 0 ? chosenCodePage : system::DefaultCodePage();
-}
-
 /// The encoding of a page that is built in.
 std::optional<Encoding> FindEncoding(unsigned identifier)
 {
@@ -38,6 +33,11 @@ std::optional<Encoding> FindEncoding(unsigned identifier)
 }
 
 } // namespace
+
+unsigned ThreadCodePage()
+{
+    return chosenCodePage != 0 ? chosenCodePage : system::DefaultCodePage();
+}
 
 bool SetThreadCodePage(unsigned identifier)
 {
