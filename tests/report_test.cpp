@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cctype>
 #include <functional>
 #include <limits>
 #include <sstream>
@@ -78,6 +79,48 @@ TEST(Findings, AreThoseThatTheFilesOfTheTableGive)
         }
     }
     EXPECT_GT(cases, 20);
+}
+
+TEST(Findings, AreThoseOfTheirPage)
+{
+    std::istringstream lines(ReadBytes(dcm::FromUtf8(DCM_DOCS "/findings.md")));
+    const Folder folder;
+    std::vector<std::string> sections;
+    std::string severities, file;
+    bool inFile = false;
+    int examples = 0;
+    const auto checkExample = [&] {
+        SCOPED_TRACE(sections.back());
+        const CString path = folder / L"in.dcm";
+        WriteBytes(path, Bytes(Unmarked(std::exchange(file, ""))));
+        DCMConverter document;
+        dcm::Report report;
+        dcm::Import(document, path, report);
+        EXPECT_GT(report.Count(sections.back()), 0U);
+        for (const dcm::Finding& finding : report.Findings()) {
+            const bool named =
+                severities.find(dcm::ToUtf8(dcm::NameOf(finding.severity))) != std::string::npos;
+            EXPECT_TRUE(named || finding.id != sections.back());
+        }
+        ++examples;
+    };
+    for (std::string line; std::getline(lines, line);) {
+        if (line == "```") {
+            inFile = false;
+            checkExample();
+        } else if (inFile) {
+            file += line + "\n";
+        } else if (line == "```dcm") {
+            inFile = true;
+        } else if (line.starts_with("## ")) {
+            sections.push_back(line.substr(3));
+        } else if (line.starts_with("**")) {
+            severities = line.substr(2, line.find(".**") - 2);
+            severities[0] = static_cast<char>(std::tolower(severities[0]));
+        }
+    }
+    EXPECT_TRUE(std::ranges::equal(sections, dcm::FindingIds()));
+    EXPECT_GT(examples, 40);
 }
 
 TEST(Report, SaysWhyAFileCannotBeUsed)
