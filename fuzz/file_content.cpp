@@ -103,8 +103,21 @@ void SetSingleValue(Content& block, const std::string& keyword, std::string_view
         block.values.push_back({false, 0, std::string(Strip(rest, "\""))});
 }
 
+/// Whether a line of points says nothing to a kind that has no such axis: an empty text equals
+/// none.
+bool SaysNothing(const Content& block, const std::string& keyword, std::string_view rest)
+{
+    const bool y = keyword == "ST/Y" || keyword == "ST_TX/Y";
+    const bool x = keyword == "ST/X" || keyword == "ST_TX/X";
+    const bool hasY = block.head[0].ends_with("KENNFELD");
+    const bool hasX = hasY || block.head[0].ends_with("KENNLINIE") || block.head[0][0] == 'S';
+    return Strip(rest, " \t\v\f\r\"").empty() && ((x && !hasX) || (y && !hasY));
+}
+
 void AddLine(Content& block, const std::string& keyword, std::string_view rest)
 {
+    if (SaysNothing(block, keyword, rest))
+        return;
     const bool single = block.head[0] == "FESTWERT" || block.head[0] == "TEXTSTRING";
     if (kTexts.contains(keyword)) {
         const std::string_view text = Strip(rest, " \t\v\f\r\"");
