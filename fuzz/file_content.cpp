@@ -90,12 +90,10 @@ const std::set<std::string> kKinds = {"FESTWERT",  "FESTWERTEBLOCK", "STUETZSTEL
 const std::set<std::string> kTexts = {"LANGNAME",  "DISPLAYNAME", "FUNKTION", "EINHEIT_W",
                                       "EINHEIT_X", "EINHEIT_Y",   "*SSTX",    "*SSTY"};
 
-/// The value of a single value block: the whole rest of its line.
+/// The value of a single value block: the whole rest of its line; an empty number is 0.
 void SetSingleValue(Content& block, const std::string& keyword, std::string_view rest)
 {
     rest = Strip(rest, kWhite);
-    if (keyword == "WERT" && rest.empty())
-        return;
     block.values.clear();
     if (keyword == "WERT")
         block.values.push_back(NumberItem(std::string(rest)));
