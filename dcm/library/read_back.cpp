@@ -190,11 +190,13 @@ private:
     void CompareAxis(const Axis& wrote, const Axis& read)
     {
         CompareText(wrote.unit, read.unit, TextRole::kAttribute);
-        if (!wrote.distribution.IsEmpty() && read.distribution.IsEmpty())
+        // A name that was read is not blank, so a blank one was set.
+        const bool blank = wrote.distribution.View().find_first_not_of(L' ') == std::wstring::npos;
+        if (!blank && read.distribution.IsEmpty())
             Add(FindingKind::kReferenceNotWritten,
                 {L"The name of the distribution ", MessagePart::Quoted(wrote.distribution),
                  L" is not written, as it was not set for export."});
-        else if (!wrote.distribution.IsEmpty())
+        else
             CompareText(wrote.distribution, read.distribution, TextRole::kName);
         CompareItems(wrote.points, read.points);
     }
