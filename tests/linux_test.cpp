@@ -386,6 +386,16 @@ TEST(LinuxFile, ReportsAFullDevice)
     EXPECT_EQ(DCMConverter().Import(L"/dev/null"), S_OK);
 }
 
+TEST(LinuxFile, ReportsThatItCannotBeRead)
+{
+    DCMConverter document;
+    dcm::Report report;
+    Under({"read", 1, EIO},
+          [&] { EXPECT_EQ(dcm::Import(document, DCM_ALL_KINDS, report), E_UNEXPECTED); });
+    EXPECT_EQ(report.Count(), 1U);
+    EXPECT_EQ(report.Count("cannot-read"), 1U);
+}
+
 TEST(Save, LeavesTheOldFileWhenACallFails)
 {
     const Folder folder;
