@@ -3,6 +3,7 @@
 #include "dcm/elements/number.h"
 #include "dcm/library/dcm.h"
 #include "dcm/platform/codepage.h"
+#include "dcm/platform/word.h"
 
 #include <array>
 #include <stdexcept>
