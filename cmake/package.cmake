@@ -1,5 +1,5 @@
-# Debian packages by CPack: libdcm1 to run hosts, libdcm-dev to build them, dcm-tools with the program. scripts/package builds and
-# checks them.
+# Debian packages by CPack: libdcm1 to run hosts, libdcm-dev to build them, dcm-tools with the program,
+# python3-dcm with the Python module. scripts/package builds and checks them.
 set(DCM_DEBIAN_REVISION 1 CACHE STRING "Revision of the Debian packages")
 set(DCM_DEBIAN_MAINTAINER "The dcm project <dcm@dcm.invalid>" CACHE STRING
     "Maintainer of the Debian packages")
@@ -10,7 +10,7 @@ set(CPACK_GENERATOR DEB)
 set(CPACK_PACKAGE_NAME dcm)
 set(CPACK_PACKAGE_VERSION ${PROJECT_VERSION})
 set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
-set(CPACK_COMPONENTS_ALL Runtime Development Tools)
+set(CPACK_COMPONENTS_ALL Runtime Development Tools Python)
 set(CPACK_DEB_COMPONENT_INSTALL ON)
 set(CPACK_STRIP_FILES ON)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
@@ -52,6 +52,16 @@ set(CPACK_DEBIAN_TOOLS_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS ${PROJECT_BINARY_DIR}/dcm)
 set(CPACK_DEBIAN_TOOLS_PACKAGE_DEPENDS "${runtime} (>= ${PROJECT_VERSION})")
 
+set(CPACK_DEBIAN_PYTHON_PACKAGE_NAME python3-dcm)
+set(CPACK_DEBIAN_PYTHON_PACKAGE_SECTION python)
+set(CPACK_COMPONENT_PYTHON_DESCRIPTION "${text} the Python module dcm, with values as numpy
+arrays.")
+set(CPACK_DEBIAN_PYTHON_PACKAGE_SHLIBDEPS ON)
+# The compiled part is that of one version of Python.
+set(CPACK_DEBIAN_PYTHON_PACKAGE_DEPENDS "${runtime} (>= ${PROJECT_VERSION}), python3-numpy, \
+python3 (>= ${DCM_PYTHON_VERSION}), python3 (<< ${DCM_PYTHON_NEXT_VERSION})")
+set(CPACK_DEBIAN_PYTHON_PACKAGE_SUGGESTS "python3-pandas, python3-matplotlib, python3-distributed")
+
 # The documents that every Debian package has.
 string(TIMESTAMP DCM_DEBIAN_DATE "%a, %d %b %Y %H:%M:%S +0000" UTC)
 set(documents ${PROJECT_BINARY_DIR}/debian)
@@ -66,7 +76,7 @@ string(REGEX REPLACE "^.*\n(Permission is .*)\n$" "\\1" license "${license}")
 string(REPLACE "\n\n" "\n.\n" license "${license}")
 string(REPLACE "\n" "\n " license " ${license}")
 configure_file(cmake/debian/copyright.in ${documents}/copyright @ONLY)
-foreach(component Runtime Development Tools)
+foreach(component Runtime Development Tools Python)
     string(TOUPPER ${component} name)
     install(FILES ${documents}/changelog.gz ${documents}/changelog.Debian.gz
             ${documents}/copyright
