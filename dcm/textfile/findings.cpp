@@ -1,6 +1,7 @@
 #include "dcm/textfile/findings.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <string>
 #include <utility>
 
@@ -103,7 +104,7 @@ void MessagePart::AppendTo(CString& message) const
     const bool cut = shown.size() > kQuotedMax;
     shown.resize(std::min(shown.size(), kQuotedMax));
     std::ranges::replace_if(
-        shown, [](wchar_t c) { return (c >= 0 && c < L' ') || c == 0x7F; }, L'.');
+        shown, [](wchar_t c) { return static_cast<std::uint32_t>(c) < 0x20 || c == 0x7F; }, L'.');
     message.Append(L"\"").Append(shown).Append(cut ? L"...\"" : L"\"");
 }
 
