@@ -135,7 +135,7 @@ def test_fleet_of_a_hundred_files(tmp_path):
     csv, picture = tmp_path / "table.csv", tmp_path / "spread.png"
     command = [sys.executable, ROOT / "examples/python/fleet.py", tmp_path, MAP]
     command += ["--workers", "2", "--csv", csv, "--plot", picture]
-    result = subprocess.run(command, capture_output=True, text=True, timeout=240)
+    result = subprocess.run(command, capture_output=True, text=True, timeout=600)
     assert result.returncode == 0, result.stderr
     table = pandas.read_csv(csv).set_index("file")
     assert len(table) == 101 and "101 of 101 files" in result.stderr
