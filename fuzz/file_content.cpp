@@ -90,10 +90,12 @@ const std::set<std::string> kKinds = {"FESTWERT",  "FESTWERTEBLOCK", "STUETZSTEL
 const std::set<std::string> kTexts = {"LANGNAME",  "DISPLAYNAME", "FUNKTION", "EINHEIT_W",
                                       "EINHEIT_X", "EINHEIT_Y",   "*SSTX",    "*SSTY"};
 
-/// The value of a single value block: the whole rest of its line; an empty number is 0.
+/// The value of a single value block: the whole rest of its line. An empty number says nothing.
 void SetSingleValue(Content& block, const std::string& keyword, std::string_view rest)
 {
     rest = Strip(rest, kWhite);
+    if (keyword == "WERT" && rest.empty())
+        return;
     block.values.clear();
     if (keyword == "WERT")
         block.values.push_back(NumberItem(std::string(rest)));
@@ -154,23 +156,30 @@ bool ListsItsAxis(const Content& block)
            std::adjacent_find(block.rows.begin(), block.rows.end()) != block.rows.end();
 }
 
-} // namespace
-
-bool SayTheSame(const Content& one, const Content& other)
+/// A single value without a number is written as 0.
+bool HaveTheSameValues(const Content& said, const Content& kept)
 {
-    return one.head == other.head && one.texts == other.texts && one.x == other.x &&
-           one.y == other.y && one.values == other.values &&
-           (one.rows == other.rows || ListsItsAxis(one) || ListsItsAxis(other));
+    const std::vector<Item> zero = {{true, 0, {}}};
+    return said.values == kept.values || (said.values.empty() && kept.values == zero);
 }
 
-bool SayTheSame(const FileContent& one, const FileContent& other)
+} // namespace
+
+bool SayTheSame(const Content& said, const Content& kept)
+{
+    return said.head == kept.head && said.texts == kept.texts && said.x == kept.x &&
+           said.y == kept.y && HaveTheSameValues(said, kept) &&
+           (said.rows == kept.rows || ListsItsAxis(said) || ListsItsAxis(kept));
+}
+
+bool SayTheSame(const FileContent& said, const FileContent& kept)
 {
     const auto same = [](const auto& a, const auto& b) {
         return a.first == b.first &&
                std::equal(a.second.begin(), a.second.end(), b.second.begin(), b.second.end(),
                           [](const Content& x, const Content& y) { return SayTheSame(x, y); });
     };
-    return std::equal(one.begin(), one.end(), other.begin(), other.end(), same);
+    return std::equal(said.begin(), said.end(), kept.begin(), kept.end(), same);
 }
 
 FileContent ContentOf(std::string_view file)

@@ -34,15 +34,15 @@ struct Content
     std::vector<std::size_t> rows;
 };
 
-/// Whether both blocks say the same. Where one lists several points of the Y axis before their
-/// values, the order of the values alone tells their rows.
-bool SayTheSame(const Content& one, const Content& other);
+/// Whether the second block says all that the first one says, and no more. Where one lists several
+/// points of the Y axis before their values, the order of the values alone tells their rows.
+bool SayTheSame(const Content& said, const Content& kept);
 
 /// The blocks by kind, in the order of the file within each kind.
 using FileContent = std::map<std::string, std::vector<Content>>;
 
 FileContent ContentOf(std::string_view file);
-bool SayTheSame(const FileContent& one, const FileContent& other);
+bool SayTheSame(const FileContent& said, const FileContent& kept);
 
 /// The content for a message.
 std::string Describe(const FileContent& content);
