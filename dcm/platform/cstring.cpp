@@ -188,10 +188,11 @@ int CString::Replace(std::wstring_view from, std::wstring_view to)
 void CString::Empty() noexcept
 {
     // The other owners of a shared text keep it.
-    if (IsShared())
+    if (IsShared()) {
         *this = CString();
-    else
+    } else {
         EndExtend(m_data->Text());
+    }
 }
 
 CString& CString::Append(std::wstring_view text)

@@ -349,12 +349,13 @@ CString Decode(std::string_view bytes, Encoding encoding)
 
 std::string_view WithoutFirstCharacter(std::string_view bytes, Encoding encoding)
 {
-    if (encoding == Encoding::kUtf8)
+    if (encoding == Encoding::kUtf8) {
         TakeUtf8(bytes);
-    else if (encoding == Encoding::kLenientUtf8)
+    } else if (encoding == Encoding::kLenientUtf8) {
         TakeLenientUtf8(bytes);
-    else
+    } else {
         bytes.remove_prefix(1);
+    }
     return bytes;
 }
 

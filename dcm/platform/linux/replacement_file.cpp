@@ -76,12 +76,13 @@ long FindTarget(const CString& path, Replacement& replacement, CFileException::C
     struct stat status = {};
     if (fstat(file, &status) != 0)
         return errno;
-    if (S_ISCHR(status.st_mode))
+    if (S_ISCHR(status.st_mode)) {
         replacement.device = true;
-    else if (!S_ISREG(status.st_mode))
+    } else if (!S_ISREG(status.st_mode)) {
         refusal = CFileException::accessDenied;
-    else if (!Lock(file))
+    } else if (!Lock(file)) {
         refusal = CFileException::sharingViolation;
+    }
     return 0;
 }
 
