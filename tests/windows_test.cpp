@@ -2,7 +2,7 @@
 
 // Other headers of the system find no choice of the library's.
 #if defined(WIN32_LEAN_AND_MEAN) || defined(NOMINMAX)
-#error "The library's header leaves macros behind."
+#error "The library's header leaves macros defined."
 #endif
 
 #include "tests/support.h"

@@ -53,8 +53,7 @@ public:
 
     /// Stores the version in the document; the file always declares 2.0.
     void SetVersion(double dVersion) { m_format.SetValue(dVersion); }
-    /// Sets the text at the top of the exported file. Lines that shall be comments bring their
-    /// "* " along.
+    /// Sets the text at the top of the exported file. Comment lines must begin with "* ".
     void SetHeader(const CString& strHeader) { m_header.SetText(strHeader); }
     /// The comment at the top of the file imported last that had one: its lines, each ended by a
     /// line feed, without any "* ". It is not exported.
@@ -130,7 +129,7 @@ private:
     std::list<DCMFestkennfeld> m_listFestkennfeld;
     std::list<DCMGruppenkennfeld> m_listGruppenkennfeld;
     std::list<DCMTextstring> m_listTextstring;
-    /// Whether a block of a known kind has been met in this import: it ends the comment.
+    /// Whether this import has read a block of a known kind, which ends the comment.
     std::int32_t m_bBlockSeen = 0;
     CString m_strComment;
 };

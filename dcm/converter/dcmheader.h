@@ -19,7 +19,7 @@ public:
     DCMHeader& operator=(DCMHeader&&) noexcept = default;
     virtual ~DCMHeader();
 
-    /// Replaces the text. Lines that shall be comments bring their "* " along. Returns 0.
+    /// Replaces the text. Comment lines must begin with "* ". Returns 0.
     HRESULT SetText(const CString& strText);
 
     /// Writes the text and two line ends, also for an empty text. Returns 0; a failed write is

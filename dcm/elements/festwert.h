@@ -14,12 +14,12 @@ class DCM_API DCMFestwert : public DCMBaseType
 public:
     /// Empty texts and no value.
     DCMFestwert();
-    /// Copies take the keyword along: a copy of a TEXTSTRING writes a TEXTSTRING. A block that was
-    /// moved from has no defined content. Raises when the text of the value cannot be copied.
+    /// Copies include the keyword: a copy of a TEXTSTRING writes a TEXTSTRING. A block that was
+    /// moved from has no defined content. Throws when the text of the value cannot be copied.
     DCMFestwert(const DCMFestwert&) = default;
     DCMFestwert(DCMFestwert&&) noexcept = default;
     /// As construction does. When the text of the value cannot be copied, the value becomes
-    /// `VT_ERROR` with the failure code, and the failure is raised.
+    /// `VT_ERROR` with the failure code, and the failure is thrown.
     DCMFestwert& operator=(const DCMFestwert&) = default;
     DCMFestwert& operator=(DCMFestwert&&) noexcept = default;
     ~DCMFestwert() override;
@@ -40,8 +40,8 @@ public:
     /// releases it. Returns 0, `E_POINTER` for null, or the code of a failure to clear `pValue`,
     /// which is then left alone.
     HRESULT GetValue(VARIANT* pValue) const;
-    /// Stores a copy of the value, whatever its tag. Returns 0, or `E_POINTER` for null. When a
-    /// text cannot be copied the value becomes `VT_ERROR`, and the failure is raised.
+    /// Stores a copy of the value; every tag is allowed. Returns 0, or `E_POINTER` for null. When a
+    /// text cannot be copied the value becomes `VT_ERROR`, and the failure is thrown.
     HRESULT SetValue(const VARIANT& value) { return SetValue(&value); }
     HRESULT SetValue(const VARIANT* pValue);
     /// Stores a number or truth value; returns 0. A literal zero is a number, `nullptr` is not.
@@ -53,7 +53,7 @@ public:
     /// The tag of the value: `VT_EMPTY` without one, `VT_R8` for a number, `VT_BSTR` for a text.
     VARTYPE GetValueType() const { return m_value.vt; }
 
-    /// Text of EINHEIT_W as it stands in the file, not interpreted; may be empty. The reference
+    /// Text of EINHEIT_W as it is in the file, not interpreted; may be empty. The reference
     /// stays valid as long as the block and may be written through.
     CString& GetUnit() { return m_strUnit; }
     const CString& GetUnit() const { return m_strUnit; }

@@ -27,7 +27,7 @@ public:
     /// Reads one block from its lines, each ended by one line feed, and appends to the values
     /// already held. Unknown lines are skipped; a number that cannot be read becomes 0. Counts
     /// are read from "X @ Y" only and not compared with the values. Returns 0; a WERT line without
-    /// a value raises `E_INVALIDARG` and leaves what was read before it.
+    /// a value throws `E_INVALIDARG`; what was read before it stays.
     HRESULT Init(const CString& strBlock);
 
     /// Writes the block in one piece: five values a line, or one row a line when both counts are
@@ -49,7 +49,7 @@ public:
     /// The same for the texts: what TEXT lines hold, in order.
     std::list<CString> GetStringValues() const { return m_listStringValues; }
 
-    /// Text of EINHEIT_W as it stands in the file, not interpreted; may be empty. The reference
+    /// Text of EINHEIT_W as it is in the file, not interpreted; may be empty. The reference
     /// stays valid as long as the block and may be written through.
     CString& GetUnit() { return m_strUnit; }
     const CString& GetUnit() const { return m_strUnit; }
@@ -67,7 +67,7 @@ private:
     friend struct dcm::BlockIo;
 
     /// Reads the numbers or quoted texts of one line and appends them. `strRest` is empty
-    /// afterwards. Returns 0; an empty text raises `E_INVALIDARG`.
+    /// afterwards. Returns 0; throws `E_INVALIDARG` for an empty text.
     HRESULT AddValues(CString& strRest);
     /// The same for a text that begins with a double quote; any other has no values.
     HRESULT AddStringValues(CString& strRest);

@@ -11,7 +11,7 @@
 
 /// One KENNFELD: a map of values over the points of two axes, each of the three with a unit.
 ///
-/// The values stand row by row: first the row of the first Y axis point, with one value for each X
+/// The values are in row order: first the row of the first Y axis point, with one value for each X
 /// axis point, then that of the second. The value at X index i and Y index j has the index
 /// j * (number of X axis points) + i.
 ///
@@ -23,7 +23,7 @@ class DCM_API DCMKennfeld : public DCMBaseType
 public:
     /// Empty texts, no points, axis lengths 0.
     DCMKennfeld();
-    /// Copies take the keyword along and have texts of their own. A map that was moved from has no
+    /// Copies include the keyword and have texts of their own. A map that was moved from has no
     /// defined content.
     DCMKennfeld(const DCMKennfeld&) = default;
     DCMKennfeld(DCMKennfeld&&) noexcept = default;
@@ -69,7 +69,7 @@ public:
     void SetAxisLenghtX(std::int32_t nLength) { m_nAxisLengthX = nLength; }
     void SetAxisLenghtY(std::int32_t nLength) { m_nAxisLengthY = nLength; }
 
-    /// Texts of EINHEIT_X, EINHEIT_Y and EINHEIT_W as they stand in the file, not interpreted; may
+    /// Texts of EINHEIT_X, EINHEIT_Y and EINHEIT_W as they are in the file, not interpreted; may
     /// be empty. The references stay valid as long as the block and may be written through.
     CString& GetUnit_X() { return m_strUnitX; }
     const CString& GetUnit_X() const { return m_strUnitX; }

@@ -13,7 +13,7 @@
 /// One KENNLINIE: a curve of axis points and the values over them, each with a unit.
 ///
 /// The arrays of variants are what files are read into and written from. Apart from them a host
-/// may keep lists of plain numbers in the curve; files do not know them.
+/// may keep lists of plain numbers in the curve; they are not part of any file.
 ///
 /// Each array has one type: the tag of its first item. From the first item of another tag on, the
 /// type and each further item are `VT_ERROR` without a value; such items count but are not
@@ -23,7 +23,7 @@ class DCM_API DCMKennlinie : public DCMBaseType
 public:
     /// Empty texts, no points, axis length 0.
     DCMKennlinie();
-    /// Copies take the keyword along and have texts of their own. A curve that was moved from has
+    /// Copies include the keyword and have texts of their own. A curve that was moved from has
     /// no defined content.
     DCMKennlinie(const DCMKennlinie&) = default;
     DCMKennlinie(DCMKennlinie&&) noexcept = default;
@@ -69,7 +69,7 @@ public:
     /// Any number is stored; one of 0 or less leaves the count to the values.
     void SetAxisLenghtX(std::int32_t nLength) { m_nAxisLengthX = nLength; }
 
-    /// Texts of EINHEIT_X and EINHEIT_W as they stand in the file, not interpreted; may be empty.
+    /// Texts of EINHEIT_X and EINHEIT_W as they are in the file, not interpreted; may be empty.
     /// The references stay valid as long as the block and may be written through.
     CString& GetUnit_X() { return m_strUnitX; }
     const CString& GetUnit_X() const { return m_strUnitX; }

@@ -47,7 +47,7 @@ public:
     /// The common tag of the points; 0 while there is none, `VT_ERROR` when they differ.
     VARTYPE GetValueType() const { return m_vtValueType; }
 
-    /// Text of EINHEIT_X as it stands in the file, not interpreted; may be empty. The reference
+    /// Text of EINHEIT_X as it is in the file, not interpreted; may be empty. The reference
     /// stays valid as long as the block and may be written through.
     CString& GetUnit() { return m_strUnit; }
     const CString& GetUnit() const { return m_strUnit; }

@@ -119,7 +119,7 @@ DCM_API std::vector<Parameter> ParametersOf(DCMConverter&& document);
 /// a FESTWERTEBLOCK. A FESTWERT or TEXTSTRING takes the first value. A curve or map holds numbers
 /// or texts in each array: from the first of the other type on, its points are not written.
 /// Nothing is checked: names may repeat and values need not fill their rows. When memory runs out,
-/// the failure is raised and the document is as it was.
+/// the failure is thrown and the document is as it was before.
 DCM_API void Add(DCMConverter& document, const Parameter& parameter);
 /// The same by moving points and values; the parameter has no defined content afterwards.
 DCM_API void Add(DCMConverter& document, Parameter&& parameter);

@@ -5,8 +5,8 @@
 /// @file
 /// The version of the library.
 
-/// The version of these headers. Within one major number a host goes on working, without being
-/// compiled anew, with a library of the same or a later version.
+/// The version of these headers. Within one major number a host works, without being
+/// compiled again, with a library of the same or a later version.
 #define DCM_VERSION_MAJOR 1
 #define DCM_VERSION_MINOR 0
 #define DCM_VERSION_PATCH 0

@@ -12,7 +12,7 @@ std::string Describe(CFileException::Cause cause, long osError, const CString& f
 {
     std::string text = dcm::ToUtf8(fileName);
     text += ": ";
-    // The system's words, such as "resource temporarily unavailable", do not tell what to do.
+    // The system's words, such as "resource temporarily unavailable", do not say what to do.
     if (cause == CFileException::sharingViolation)
         return text += "another program or document has the file open";
     if (osError != 0)

@@ -107,7 +107,7 @@ public:
     /// throws `fileTooLarge`.
     virtual void Write(const void* buffer, UINT count);
     /// Closes the file; does nothing when none is open. Throws `CFileException` when the system
-    /// could not store all of the file, which is closed all the same.
+    /// could not store all of the file, which is closed anyway.
     virtual void Close();
 
 protected:

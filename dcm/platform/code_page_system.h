@@ -12,7 +12,7 @@ unsigned DefaultCodePage();
 /// Whether the system converts the code page both ways.
 bool KnowsCodePage(unsigned identifier);
 
-/// Text of the code page as UTF-8; bytes that are no character become U+FFFD.
+/// Text of the code page as UTF-8; bytes that are not a character become U+FFFD.
 std::string CodePageToUtf8(unsigned identifier, std::string_view bytes);
 
 /// Text in UTF-8 in the code page; a character that the page lacks becomes `?`.

@@ -18,7 +18,7 @@ DCM_API bool SetThreadCodePage(unsigned identifier);
 /// The code page of the calling thread, for a host that sets another one for a while.
 DCM_API unsigned ThreadCodePage();
 
-/// `text` in UTF-8, and the wide form of a text in UTF-8; what is no character becomes U+FFFD.
+/// `text` in UTF-8, and the wide form of a text in UTF-8; what is not a character becomes U+FFFD.
 DCM_API std::string ToUtf8(std::wstring_view text);
 DCM_API CString FromUtf8(std::string_view text);
 

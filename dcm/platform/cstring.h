@@ -160,7 +160,7 @@ public:
         AppendChar(character);
         return *this;
     }
-    /// Any other number is no character.
+    /// Other numbers are not characters.
     template <dcm::NoCharacter Number>
     CString& operator+=(Number) = delete;
 
@@ -190,7 +190,7 @@ public:
     friend CString operator+(const wchar_t* a, const CString& b) { return CString(a) + b; }
     friend CString operator+(const CString& a, wchar_t b) { return a + Whole(b); }
     friend CString operator+(wchar_t a, const CString& b) { return CString(Whole(a)) + b; }
-    /// Any other number is no character.
+    /// Other numbers are not characters.
     template <dcm::NoCharacter Number>
     friend CString operator+(const CString&, Number) = delete;
     template <dcm::NoCharacter Number>
@@ -232,7 +232,7 @@ public:
     {
         return a.View() <=> Whole(b);
     }
-    /// Any other number is no character.
+    /// Other numbers are not characters.
     template <dcm::NoCharacter Number>
     friend bool operator==(const CString&, Number) = delete;
     template <dcm::NoCharacter Number>

@@ -38,7 +38,8 @@ constexpr std::size_t MaxBytes(Encoding encoding)
 /// lacks become `?`; in UTF-8 a number that is no character becomes U+FFFD.
 char* Encode(std::wstring_view text, Encoding encoding, char* to);
 
-/// Appends the wide form of `bytes` to `text`. In UTF-8, bytes that are no character become U+FFFD.
+/// Appends the wide form of `bytes` to `text`. In UTF-8, bytes that are not a character become
+/// U+FFFD.
 void AppendDecoded(CString& text, std::string_view bytes, Encoding encoding);
 
 /// The wide form of `bytes`.

@@ -4,7 +4,7 @@
 
 namespace dcm::system {
 
-/// The path of the device that takes whatever is written to it and keeps nothing.
+/// The path of the device that accepts all that is written to it and keeps nothing.
 extern const std::wstring_view kNullDevice;
 
 } // namespace dcm::system

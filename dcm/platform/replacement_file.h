@@ -29,10 +29,9 @@ CString FolderOf(const CString& target);
 /// Creates the empty file `path`, which must not exist, with the mode of the target if there is
 /// one.
 long CreateBeside(const CString& path, const Replacement& replacement);
-/// Writes the new file through to the disk, lets it take the place of the target and lets go of
-/// that.
+/// Writes the new file through to the disk, replaces the target by it and closes the target.
 long TakePlace(Replacement& replacement);
-/// Lets go of the target and removes the new file, if there still is one. Errors are ignored.
+/// Closes the target and removes the new file, if there still is one. Ignores errors.
 void Abandon(Replacement& replacement) noexcept;
 
 } // namespace system
@@ -44,7 +43,7 @@ class ReplacementFile
 {
 public:
     /// Creates an empty file beside the one that `path` leads to, which nobody else may have open
-    /// from now on where the system can see to that. A folder, a pipe or a file that may not be
+    /// from now on where the system can ensure it. A folder, a pipe or a file that may not be
     /// written is refused.
     explicit ReplacementFile(const CString& path);
     ReplacementFile(const ReplacementFile&) = delete;
@@ -54,7 +53,7 @@ public:
 
     /// Where to write: the new file, or the given path if that is a device.
     const CString& Path() const { return m_replacement.device ? m_path : m_replacement.file; }
-    /// Lets the new file, which must be closed, take its place.
+    /// Replaces the old file by the new one, which must be closed.
     void TakePlace();
 
 private:

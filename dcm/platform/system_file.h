@@ -19,7 +19,7 @@ inline constexpr std::uint64_t kSizeLimit = std::uint64_t{1} << 31;
 
 /// Opens a file for exclusive use, by the flags of `CFile`. Returns `kNoFile` on a failure, which
 /// leaves an existing file as it was. `refusal` is then the cause of a failure that the error
-/// number does not tell, otherwise it is not changed.
+/// number does not give, otherwise it is not changed.
 FileHandle OpenFile(const CString& path, UINT flags, long& error, CFileException::Cause& refusal);
 
 /// The number of this process. A forked child shares the open files of its parent.

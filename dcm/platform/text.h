@@ -11,7 +11,7 @@
 /// file are trimmed and compared without being converted.
 namespace dcm {
 
-/// White space is U+0009 to U+000D and U+0020, whatever the locale.
+/// White space is U+0009 to U+000D and U+0020 in every locale.
 constexpr bool IsWhite(char c)
 {
     return c <= ' ' && (c == ' ' || (c >= '\t' && c <= '\r'));

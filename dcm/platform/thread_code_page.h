@@ -14,7 +14,7 @@ namespace dcm {
 /// system converts.
 std::optional<Encoding> ThreadEncoding();
 
-/// Text in the thread's code page as UTF-8, and the reverse. Bytes that are no character become
+/// Text in the thread's code page as UTF-8, and the reverse. Bytes that are not a character become
 /// U+FFFD; a character that the page lacks becomes `?`.
 std::string ThreadCodePageToUtf8(std::string_view bytes);
 std::string Utf8ToThreadCodePage(std::string_view utf8);

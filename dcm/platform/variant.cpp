@@ -62,7 +62,7 @@ VARIANT CComVariant::Detach() noexcept
 
 void CComVariant::OwnCopy()
 {
-    // There is nothing to copy, whatever the tag, in an absent text or a point without a value.
+    // An absent text and a point without a value have nothing to copy.
     constexpr std::size_t head = offsetof(VARIANT, llVal);
     const VARIANT nothing = {};
     if (std::memcmp(&llVal, &nothing.llVal, sizeof(VARIANT) - head) == 0)

@@ -32,7 +32,8 @@ std::string NameOf(unsigned identifier)
     }
 }
 
-/// A conversion of the C library. Pages that it knows fail to open for want of memory or files.
+/// A conversion of the C library. A page that it knows fails to open only when memory
+/// or files run out.
 class Conversion
 {
 public:
@@ -64,8 +65,9 @@ public:
         });
     }
 
-    /// Converts all of `text` to UTF-8; a byte that is no character becomes U+FFFD. `holdsLetters`
-    /// says that the page holds a letter back until it knows whether marks for it follow.
+    /// Converts all of `text` to UTF-8; a byte that is not a character becomes U+FFFD.
+    /// `holdsLetters` says that the page holds a letter back until it knows whether marks for it
+    /// follow.
     std::string ToUtf8(std::string_view text, bool holdsLetters)
     {
         return Convert(text, [=](std::string_view& rest, std::string& result, Conversion& page) {

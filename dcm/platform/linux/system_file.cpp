@@ -61,7 +61,7 @@ FileHandle OpenFile(const CString& path, UINT flags, long& error, CFileException
         error = EISDIR;
         return kNoFile;
     }
-    // A character device such as /dev/full is written to like a file; nobody owns it.
+    // A character device such as /dev/full is written like a file and never locked.
     if (!S_ISREG(status.st_mode)) {
         if (S_ISCHR(status.st_mode))
             return file.Release();
@@ -147,7 +147,7 @@ long CloseFile(FileHandle file, bool endUse) noexcept
     // have some file systems: no error.
     if (endUse)
         flock(number, LOCK_UN);
-    // After an interrupted close the file is closed all the same.
+    // After an interrupted close the file is closed anyway.
     return close(number) == 0 || errno == EINTR ? 0 : errno;
 }
 

@@ -24,7 +24,7 @@ HANDLE OpenToWrite(const wchar_t* path, DWORD creation)
                        FILE_ATTRIBUTE_NORMAL, nullptr);
 }
 
-/// The path of an open file itself, behind all links.
+/// The path of an open file itself, with all links followed.
 CString FinalPath(HANDLE file)
 {
     std::wstring path(MAX_PATH, L'\0');
@@ -58,7 +58,7 @@ void LetGo(Replacement& replacement)
 long FindTarget(const CString& path, Replacement& replacement, CFileException::Cause& refusal)
 {
     replacement.target = path;
-    // A link that leads nowhere gets its file here, as any writing through it would create it.
+    // A link to a missing file creates that file, as writing through the link would.
     const HANDLE file = OpenToWrite(path, IsLink(path) ? OPEN_ALWAYS : OPEN_EXISTING);
     if (file == INVALID_HANDLE_VALUE)
         return GetLastError() == ERROR_FILE_NOT_FOUND ? 0 : LastError();

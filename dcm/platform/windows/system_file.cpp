@@ -61,7 +61,7 @@ FileHandle OpenFile(const CString& path, UINT flags, long& error, CFileException
         return kNoFile;
     }
     const DWORD type = GetFileType(file.Get());
-    // A character device such as NUL is written to like a file; nobody owns it.
+    // A character device such as NUL is written like a file and never locked.
     if (type == FILE_TYPE_CHAR)
         return file.Release();
     if (type != FILE_TYPE_DISK) {
