@@ -9,8 +9,6 @@
 
 namespace dcm {
 struct BlockIo;
-class FileBlock;
-class FileText;
 } // namespace dcm
 
 /// A text file in the ANSI code page: read as a whole and handed out line by line, or written text
@@ -49,10 +47,6 @@ protected:
 private:
     friend struct dcm::BlockIo;
     struct Content;
-
-    bool ReadBlock(dcm::FileBlock& block);
-    bool AddRest(dcm::FileBlock& block) const;
-    const dcm::FileText& Text() const;
 
     std::unique_ptr<Content> m_pContent;
 };
