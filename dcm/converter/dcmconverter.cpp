@@ -143,9 +143,10 @@ void dcm::DocumentIo::Read(DCMConverter& document, FileBlock& block, ImportRepor
                   {L"The line has no value where one must be; the import ends with it."});
         throw;
     }
-    if (keep && lines.Stored() != nullptr)
+    if (keep && lines.Stored() != nullptr) {
         report->Keep(*lines.Stored(), lines.Kind(), lines.FirstLine(), lines.VariantLine(),
                      lines.HasReferenceX() || lines.HasReferenceY());
+    }
 }
 
 void dcm::DocumentIo::DropBlocks(DCMConverter& document) noexcept

@@ -41,9 +41,10 @@ void ImportReport::BeginText(const FileText& text, std::int32_t number) noexcept
     const std::size_t zero = bytes.find('\0');
     std::string_view read = bytes.substr(0, zero);
     const FileText::Origin& origin = text.OriginOfBytes();
-    if (origin.textAfterZero || HasTextAfterZero(bytes))
+    if (origin.textAfterZero || HasTextAfterZero(bytes)) {
         Add(FindingKind::kTextAfterZero, Severity::kError, LineAt(read, read.npos, number), {},
             {L"A zero byte ends the text; what follows it in the file is not read."});
+    }
     auto bad = BlockReport::BadBytes::kNone;
     std::size_t skipped = 0;
     if (number == 1 && read.starts_with(kByteOrderMark)) {
@@ -94,25 +95,28 @@ void ImportReport::Unfinished(const FileBlock& block, bool lineEnds) noexcept
     m_block.Skipped(block, true);
     const std::size_t last = block.LineCount() - 1;
     if (!lineEnds && !TrimWhite(block.Line(last)).empty() &&
-        m_findings.CountOf(FindingKind::kUnfinishedBlock) == errors)
+        m_findings.CountOf(FindingKind::kUnfinishedBlock) == errors) {
         Add(FindingKind::kNoLineEnd, Severity::kNote, block.LineNumber(last), {},
             {L"The last line of the file has no line end."});
+    }
 }
 
 void ImportReport::End(const DCMConverter& document) noexcept
 {
-    if (m_maybeUtf8 && !m_notUtf8)
+    if (m_maybeUtf8 && !m_notUtf8) {
         Add(FindingKind::kLooksLikeUtf8, Severity::kWarning, m_utf8Line, {},
             {L"The file looks like UTF-8, but is read in another code page."});
+    }
     if (!m_kept)
         return;
     try {
         const auto refers = [](const Kept& kept) { return kept.references; };
         if (std::ranges::any_of(*m_kept, refers)) {
             SetDistributions(document);
-            for (const Kept& kept : *m_kept)
+            for (const Kept& kept : *m_kept) {
                 if (kept.references)
                     CompareAxes(*kept.block, kept.kind, kept.line);
+            }
         }
         CompareNames();
     } catch (...) {
@@ -131,15 +135,17 @@ void ImportReport::CompareNames()
         const bool repeats = end - group > 1;
         for (auto kept = group; kept != end; ++kept) {
             // Names of equal hashes are equal, but for an accident that only tells too much.
-            if (kept->variantLine != 0)
+            if (kept->variantLine != 0) {
                 Add(FindingKind::kVariantLine, repeats ? Severity::kWarning : Severity::kNote,
                     kept->variantLine, LabelOf(*kept->block, kept->kind),
                     {L"What tells variants of the parameter apart is not kept."});
-            if (kept != group && kept->block->GetName() == group->block->GetName())
+            }
+            if (kept != group && kept->block->GetName() == group->block->GetName()) {
                 Add(FindingKind::kDuplicateName, Severity::kNote, kept->line,
                     LabelOf(*kept->block, kept->kind),
                     {L"The block in line ", std::int64_t{group->line},
                      L" has the same kind and name."});
+            }
         }
         group = end;
     }
@@ -179,10 +185,11 @@ void ImportReport::CompareAxis(std::wstring_view name, const std::vector<CComVar
     }
     std::vector<CComVariant> shared;
     found->second->GetValues(shared);
-    if (!points.empty() && !std::ranges::equal(points, shared, SamePoint))
+    if (!points.empty() && !std::ranges::equal(points, shared, SamePoint)) {
         Add(FindingKind::kDistributionDiffers, Severity::kWarning, line, label,
             {L"The axis points differ from those of the distribution ", MessagePart::Quoted(name),
              L"."});
+    }
 }
 
 CString ImportReport::LabelOf(const DCMBaseType& block, std::size_t kind)

@@ -58,14 +58,15 @@ bool dcm::BlockIo::ReadAttribute(std::string_view keyword, std::string_view valu
                                  std::string_view function, const BlockReader& reader,
                                  DCMBaseType& block)
 {
-    if (EqualsNoCase(keyword, keyword::kLangname))
+    if (EqualsNoCase(keyword, keyword::kLangname)) {
         block.m_strLangname = reader.Attribute(value);
-    else if (EqualsNoCase(keyword, keyword::kDisplayname))
+    } else if (EqualsNoCase(keyword, keyword::kDisplayname)) {
         block.m_strDisplayname = reader.Attribute(value);
-    else if (EqualsNoCase(keyword, keyword::kFunktion))
+    } else if (EqualsNoCase(keyword, keyword::kFunktion)) {
         block.m_strFunction = reader.Attribute(function);
-    else
+    } else {
         return false;
+    }
     return true;
 }
 

@@ -64,7 +64,7 @@ bool IsKindKeyword(std::string_view word)
 
 std::string_view WordOf(std::string_view text)
 {
-    const auto end = std::ranges::find_if(text, IsWhite);
+    const auto* const end = std::ranges::find_if(text, IsWhite);
     return text.substr(0, static_cast<std::size_t>(end - text.begin()));
 }
 
@@ -72,10 +72,11 @@ void RowCheck::AfterLine(std::size_t points, std::size_t values, std::int64_t li
 {
     if (points > m_points) {
         // Lines of the Y axis with no value between them before the first value are one group.
-        if (m_groupPoints > 0 && (m_groupValues > 0 || m_anyGroup))
+        if (m_groupPoints > 0 && (m_groupValues > 0 || m_anyGroup)) {
             EndGroup();
-        else if (m_groupPoints == 0 && values > 0 && m_moved == 0)
+        } else if (m_groupPoints == 0 && values > 0 && m_moved == 0) {
             m_moved = line;
+        }
         if (m_groupPoints == 0)
             m_groupLine = line;
         m_groupPoints += points - m_points;
@@ -132,9 +133,10 @@ void BlockReport::Comment(const FileBlock& block)
 {
     Start(block);
     m_inComment = true;
-    if (m_commentLine != 0)
+    if (m_commentLine != 0) {
         Add(FindingKind::kDroppedComment, Severity::kNote, m_commentLine,
             {L"The comment is not kept, as another one follows before the first block."});
+    }
     m_commentLine = m_firstLine;
     LookForKinds(1);
 }
@@ -149,20 +151,22 @@ void BlockReport::Version(const FileBlock& block)
         const std::string_view line = TrimWhite(Line(i));
         if (LookForKind(i) || line.empty() || EqualsNoCase(line, keyword::kEnd))
             continue;
-        if (line.starts_with('*'))
+        if (line.starts_with('*')) {
             DroppedComment(line);
-        else
+        } else {
             Add(FindingKind::kUnknownLine,
                 {L"The line ", Quote(line), L" after the version is not read."});
+        }
     }
 }
 
 void BlockReport::VersionNotKept(std::string_view line)
 {
     const std::string_view version = TrimWhite(line.substr(WordOf(line).size()));
-    if (ReadDecimal(TrimBlanksAndQuotes(version)) != 2.0)
+    if (ReadDecimal(TrimBlanksAndQuotes(version)) != 2.0) {
         Add(FindingKind::kVersionNotKept,
             {L"The version ", Quote(version), L" is not kept; files are written as version 2.0."});
+    }
 }
 
 void BlockReport::Skipped(const FileBlock& block, bool unfinished)
@@ -189,28 +193,30 @@ void BlockReport::Skipped(const FileBlock& block, bool unfinished)
         if (costs || line.empty() || line.starts_with('*'))
             return LookForKinds(1);
     }
-    if (index == 0 && IsKindKeyword(word))
+    if (index == 0 && IsKindKeyword(word)) {
         LostKind(line, word, unfinished);
-    else if (!IsKindKeyword(word))
+    } else if (!IsKindKeyword(word)) {
         OtherBlock(line, word);
+    }
     LookForKinds(std::max(index, std::size_t{1}));
 }
 
 /// A block of one of the kinds whose first line does not show it.
 void BlockReport::LostKind(std::string_view line, std::string_view word, bool unfinished)
 {
-    if (unfinished)
+    if (unfinished) {
         AddToBlock(FindingKind::kUnfinishedBlock,
                    {L"No empty line follows the block, so it is not read."});
-    else if (line.size() > word.size() && line[word.size()] != ' ')
+    } else if (line.size() > word.size() && line[word.size()] != ' ') {
         Add(FindingKind::kTabAfterKeyword,
             {L"A blank must follow ", Quote(word), L", so the block is not read."});
-    else if (line.size() == word.size())
+    } else if (line.size() == word.size()) {
         Add(FindingKind::kUnknownBlock,
             {L"No blank and name follow ", Quote(word), L", so the block is not read."});
-    else
+    } else {
         Add(FindingKind::kUnknownBlock,
             {L"There is white space before ", Quote(word), L", so the block is not read."});
+    }
 }
 
 /// A block that is none of the ten kinds.
@@ -245,16 +251,17 @@ bool BlockReport::LookForKind(std::size_t index)
     if (index == 0 || !IsKindKeyword(word))
         return false;
     const std::int64_t number = m_block->LineNumber(index);
-    if (IsBlank(Line(index - 1)))
+    if (IsBlank(Line(index - 1))) {
         Add(FindingKind::kBlankSeparator, SeverityOf(FindingKind::kBlankSeparator), number,
             {L"The line before ", Quote(line),
              L" is not empty but white space, so the block is not read."});
-    else if (m_inComment)
+    } else if (m_inComment) {
         Add(FindingKind::kBlockInComment, SeverityOf(FindingKind::kBlockInComment), number,
             {L"No empty line precedes ", Quote(line), L", so the block is part of a comment."});
-    else
+    } else {
         Add(FindingKind::kBlockInsideBlock, SeverityOf(FindingKind::kBlockInsideBlock), number,
             {L"No empty line precedes ", Quote(line), L", so it is part of the block before."});
+    }
     return true;
 }
 
@@ -322,17 +329,19 @@ bool BlockReport::TabFollows(std::string_view bytes)
     const std::string_view word = WordOf(line);
     if (word.size() == line.size() || line[word.size()] == ' ' || !IsOneOf(word, kLineKeywords))
         return false;
-    if (!Meant(line.substr(word.size())).empty())
+    if (!Meant(line.substr(word.size())).empty()) {
         Add(FindingKind::kTabAfterKeyword,
             {L"A blank must follow ", Quote(word), L", so the line is not read."});
+    }
     return true;
 }
 
 void BlockReport::AfterEnd()
 {
-    if (!m_textAfterEnd && !IsBlank(Line(m_index)))
+    if (!m_textAfterEnd && !IsBlank(Line(m_index))) {
         Add(FindingKind::kTextAfterEnd,
             {L"The line ", Quote(TrimWhite(Line(m_index))), L" goes on after END."});
+    }
     m_textAfterEnd = true;
 }
 
@@ -385,11 +394,12 @@ void BlockReport::NameWord(std::string_view kept)
 void BlockReport::CheckName(std::string_view kept, std::string_view meant, const wchar_t* none)
 {
     m_noName = kept.empty();
-    if (m_noName)
+    if (m_noName) {
         Add(FindingKind::kNoName, {none});
-    else if (kept != meant)
+    } else if (kept != meant) {
         Add(FindingKind::kTextTrimmed,
             {L"The name ", Quote(meant), L" is kept as ", Quote(kept), L"."});
+    }
 }
 
 void BlockReport::Attribute(std::string_view kept)
@@ -417,9 +427,10 @@ void BlockReport::SingleNumber(std::string_view token)
     SingleValue();
     if (token.empty())
         return;
-    if (token != TrimWhite(m_rest))
+    if (token != TrimWhite(m_rest)) {
         Add(FindingKind::kTextAltered,
             {L"The quotes around the number ", Quote(token), L" are not kept."});
+    }
     Number(token, ReadNumber(token));
 }
 
@@ -430,12 +441,13 @@ void BlockReport::SingleText(std::string_view kept)
     const std::string_view meant = Meant(text);
     if (text.starts_with('"') != text.ends_with('"') || text.size() == 1)
         OpenQuote();
-    if (kept != meant && TrimBlanksAndQuotes(text) != kept)
+    if (kept != meant && TrimBlanksAndQuotes(text) != kept) {
         Add(FindingKind::kTextAltered,
             {L"The text ", Quote(meant), L" is kept as ", Quote(kept), L"."});
-    else if (kept != meant)
+    } else if (kept != meant) {
         Add(FindingKind::kTextTrimmed,
             {L"The text ", Quote(meant), L" is kept as ", Quote(kept), L"."});
+    }
 }
 
 void BlockReport::OpenQuote()
@@ -469,9 +481,10 @@ void BlockReport::Repeated(std::string_view keyword, std::string_view content, b
             m_slots[m_slotsUsed++] = {keyword, content};
         return;
     }
-    if (content != slot->content && !slot->content.empty())
+    if (content != slot->content && !slot->content.empty()) {
         Add(FindingKind::kRepeatedLine,
             {L"The line replaces an earlier one with other content, ", Quote(slot->content), L"."});
+    }
     slot->content = empty ? std::string_view() : content;
 }
 
@@ -518,10 +531,11 @@ bool BlockReport::TakeText(std::string_view& text)
     const bool plain =
         close != m_texts.npos && (close + 1 == m_texts.size() || m_texts[close + 1] == ' ');
     if (!plain) {
-        if (std::ranges::count(m_texts, '"') % 2 != 0)
+        if (std::ranges::count(m_texts, '"') % 2 != 0) {
             OpenQuote();
-        else
+        } else {
             TextsAltered();
+        }
         m_texts = {};
         return false;
     }
@@ -605,12 +619,13 @@ void BlockReport::CompareCount(std::int64_t count, std::size_t items, const wcha
 
 void BlockReport::DroppedItems(bool texts)
 {
-    if (texts)
+    if (texts) {
         Add(FindingKind::kTextAmongNumbers,
             {L"The texts ", Quote(TrimWhite(m_rest)), L" are not read on a line for numbers."});
-    else
+    } else {
         Add(FindingKind::kNumbersAmongTexts,
             {Quote(TrimWhite(m_rest)), L" is not read on a line for texts, which have quotes."});
+    }
 }
 
 void BlockReport::MixedTypes()
@@ -674,10 +689,11 @@ void BlockReport::LookAtCharacters(std::string_view line)
 {
     const bool bad = m_badBytes == BadBytes::kReplaced ? line.find("\xEF\xBF\xBD") != line.npos
                                                        : LookAsUtf8(line).firstBad != line.npos;
-    if (bad)
+    if (bad) {
         Add(FindingKind::kNotInCodePage,
             {L"The line ", Quote(TrimWhite(line)),
              L" has bytes that are no character of the code page; they are lost."});
+    }
 }
 
 } // namespace dcm

@@ -71,13 +71,11 @@ constexpr auto MakePowers()
 {
     std::array<Power, kMaxPower - kMinPower + 1> powers{};
     Significand up;
-    for (int power = 0; power <= kMaxPower; ++power, up.TimesTen()) {
+    for (int power = 0; power <= kMaxPower; ++power, up.TimesTen())
         powers[PowerIndex(power)] = up.Upper();
-    }
     Significand down;
-    for (int power = 0; power >= kMinPower; --power, down.OverTen()) {
+    for (int power = 0; power >= kMinPower; --power, down.OverTen())
         powers[PowerIndex(power)] = down.Upper();
-    }
     return powers;
 }
 
@@ -105,12 +103,12 @@ constexpr std::array<std::uint64_t, kMaxNormalPower - kMinNormalPower + 1> kPowe
 Decimal ToDecimalExactly(double value, int count) noexcept
 {
     std::array<char, 32> text; // d.ddde+xx
-    const auto end = std::to_chars(text.data(), text.data() + text.size(), value,
-                                   std::chars_format::scientific, count - 1)
-                         .ptr;
+    auto* const end = std::to_chars(text.data(), text.data() + text.size(), value,
+                                    std::chars_format::scientific, count - 1)
+                          .ptr;
     text[1] = text[0];
     Decimal decimal{0, 0};
-    const auto letter = std::from_chars(text.data() + 1, end, decimal.digits).ptr;
+    const auto* const letter = std::from_chars(text.data() + 1, end, decimal.digits).ptr;
     std::from_chars(letter[1] == '+' ? letter + 2 : letter + 1, end, decimal.exponent);
     decimal.exponent -= count - 1;
     return decimal;

@@ -46,7 +46,7 @@ public:
     /// Multiplies by 2^(32 x count).
     void ShiftUp(std::size_t count)
     {
-        const auto end = m_words.begin() + static_cast<std::ptrdiff_t>(m_size);
+        auto* const end = m_words.begin() + static_cast<std::ptrdiff_t>(m_size);
         std::copy_backward(m_words.begin(), end, end + static_cast<std::ptrdiff_t>(count));
         std::fill_n(m_words.begin(), count, 0);
         m_size += count;
@@ -184,7 +184,7 @@ double NearestDouble(Decimal decimal) noexcept
     if (double value = 0.0; ByOneProduct(decimal, value))
         return value;
     std::array<char, std::numeric_limits<std::uint64_t>::digits10 + 1> text;
-    const auto end = std::to_chars(text.data(), text.data() + text.size(), decimal.digits).ptr;
+    auto* const end = std::to_chars(text.data(), text.data() + text.size(), decimal.digits).ptr;
     return NearestDouble({text.data(), static_cast<std::size_t>(end - text.data())},
                          decimal.exponent);
 }

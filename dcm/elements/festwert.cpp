@@ -86,22 +86,24 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwert& block)
     while (reader.Next(line)) {
         const std::string_view value = TrimQuotes(TrimWhite(line.rest));
         const std::string_view rest = TrimBlanks(value);
-        if (line.Is(block.m_strKeyword))
+        if (line.Is(block.m_strKeyword)) {
             block.SetName(reader.Name(rest));
-        else if (ReadAttribute(line.keyword, rest, rest, reader, block))
+        } else if (ReadAttribute(line.keyword, rest, rest, reader, block)) {
             continue;
-        else if (line.Is(keyword::kEinheitW))
+        } else if (line.Is(keyword::kEinheitW)) {
             block.m_strUnit = reader.Attribute(rest);
-        else if (line.Is(keyword::kWert))
+        } else if (line.Is(keyword::kWert)) {
             block.m_value = ReadValueNumber(rest, reader.Report());
-        else if (line.Is(keyword::kText))
+        } else if (line.Is(keyword::kText)) {
             ReadValueText(value, text, reader.Report(), block.m_value);
-        else
+        } else {
             reader.UnknownLine();
+        }
     }
-    if (reader.Report() != nullptr && block.m_value.vt == VT_EMPTY)
+    if (reader.Report() != nullptr && block.m_value.vt == VT_EMPTY) {
         reader.Report()->AddToBlock(FindingKind::kNoValue,
                                     {L"The block has no value; it is written with 0.0."});
+    }
     return S_OK;
 }
 

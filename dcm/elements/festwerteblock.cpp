@@ -132,10 +132,11 @@ void ReportValues(dcm::BlockReport& report, std::string_view declared,
     const std::size_t numbers = block.GetDoubleValues().size();
     const std::size_t texts = block.GetStringValues().size();
     const std::size_t values = numbers > 0 ? numbers : texts;
-    if (numbers > 0 && texts > 0)
+    if (numbers > 0 && texts > 0) {
         report.AddToBlock(
             dcm::FindingKind::kNumbersAndTexts,
             {L"The block has numbers and texts; its ", texts, L" texts will not be written."});
+    }
     const std::size_t at = declared.find('@');
     if (at == declared.npos) {
         report.CompareCount(declared, values, L"values");
@@ -214,10 +215,11 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwerteblock& block)
 HRESULT DCMFestwerteblock::AddValues(CString& strRest)
 {
     const auto text = dcm::FileText::OfHost(strRest);
-    if (IsQuoted(text.Bytes()))
+    if (IsQuoted(text.Bytes())) {
         ReadTexts(text.Bytes(), text, nullptr, m_listStringValues);
-    else
+    } else {
         ReadNumbers(text.Bytes(), nullptr, m_vecDoubleValues);
+    }
     strRest.Empty();
     return S_OK;
 }
@@ -255,12 +257,13 @@ void dcm::BlockIo::Compose(const DCMFestwerteblock& block, FileTextBuilder& text
     text.EndLine();
     ComposeAttributes(block, text);
     AppendUnitLine(text, keyword::kEinheitW, block.m_strUnit);
-    if (block.m_nXValueCount > 0 && block.m_nYValueCount > 0)
+    if (block.m_nXValueCount > 0 && block.m_nYValueCount > 0) {
         AppendItems(text, block.m_vecDoubleValues, block.m_listStringValues, block.m_nXValueCount,
                     kShortDigits);
-    else
+    } else {
         AppendItems(text, block.m_vecDoubleValues, block.m_listStringValues, kItemsPerLine,
                     kFullDigits);
+    }
     AppendEnd(text);
 }
 

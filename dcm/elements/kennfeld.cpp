@@ -30,22 +30,25 @@ TargetsOf(const dcm::PointArray& axisX, const dcm::PointArray& axisY, const dcm:
 void ReportGrid(dcm::BlockReport& report, std::size_t x, std::size_t y, std::size_t values)
 {
     const std::size_t wanted = x * y;
-    if (values < wanted)
+    if (values < wanted) {
         report.AddToBlock(dcm::FindingKind::kIncompleteMap,
                           {L"The map has ", values, L" values where its axes ask for ", wanted,
                            L"; it will not be written."});
-    else if (values > wanted)
+    } else if (values > wanted) {
         report.AddToBlock(dcm::FindingKind::kSurplusValues,
                           {L"The map has ", values, L" values where its axes ask for ", wanted,
                            L"; the others will not be written."});
-    if (x == 0 && y == 0)
+    }
+    if (x == 0 && y == 0) {
         report.AddToBlock(dcm::FindingKind::kEmptyMap,
                           {L"The map has no axis points; it will not be written."});
-    if (const std::int64_t line = report.Rows().FirstMoved(x))
+    }
+    if (const std::int64_t line = report.Rows().FirstMoved(x)) {
         report.Add(dcm::FindingKind::kRowDiffers, dcm::SeverityOf(dcm::FindingKind::kRowDiffers),
                    line,
                    {L"The row does not have one value for each of ", x,
                     L" points of X, so that values move to another row."});
+    }
 }
 
 /// Appends the X axis, then each Y axis point with its row; nothing when there are too few values.
@@ -169,10 +172,11 @@ void dcm::BlockIo::Compose(const DCMKennfeld& block, FileTextBuilder& text)
     const std::size_t start = text.Size();
     text.Append(block.m_strKeyword).AppendAscii(" ").Append(block.GetName());
     const auto appendCount = [&](std::int32_t axisLength, std::size_t points) {
-        if (axisLength > 0)
+        if (axisLength > 0) {
             AppendCount(text, axisLength);
-        else
+        } else {
             AppendCount(text, points);
+        }
     };
     appendCount(block.m_nAxisLengthX, block.m_vecAxisX.size());
     appendCount(block.m_nAxisLengthY, block.m_vecAxisY.size());

@@ -32,9 +32,10 @@ void ReportShape(dcm::BlockReport& report, std::string_view declared, std::int32
     const std::size_t expected = points == 0 && report.HasReferenceX() ? values : points;
     if (report.Count(declared, count) && count != static_cast<std::int64_t>(expected))
         report.CountDiffers(count, expected, L"points");
-    if (expected != values)
+    if (expected != values) {
         report.AddToBlock(dcm::FindingKind::kAxisAndValuesDiffer,
                           {L"The curve has ", points, L" axis points and ", values, L" values."});
+    }
 }
 
 void AppendPointLines(dcm::FileTextBuilder& block, const std::vector<CComVariant>& axis,
@@ -101,9 +102,10 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMKennlinie& block)
             reader.UnknownLine();
         }
     }
-    if (reader.Report() != nullptr)
+    if (reader.Report() != nullptr) {
         ReportShape(*reader.Report(), declared, block.m_nAxisLengthX, block.m_vecAxis.size(),
                     block.m_vecValues.size());
+    }
     return S_OK;
 }
 
@@ -130,10 +132,11 @@ HRESULT DCMKennlinie::Export(PravFile& file)
 void dcm::BlockIo::Compose(const DCMKennlinie& block, FileTextBuilder& text)
 {
     text.Append(block.m_strKeyword).AppendAscii(" ").Append(block.GetName());
-    if (block.m_nAxisLengthX > 0)
+    if (block.m_nAxisLengthX > 0) {
         AppendCount(text, block.m_nAxisLengthX);
-    else
+    } else {
         AppendCount(text, block.m_vecValues.size());
+    }
     text.EndLine();
     ComposeAttributes(block, text);
     AppendUnitLine(text, keyword::kEinheitX, block.m_strUnitX);
@@ -176,10 +179,11 @@ HRESULT DCMKennlinie::GetValues(std::vector<CComVariant>& values) const
 
 void DCMKennlinie::AddValue(double dValue, const CString& strKeyword)
 {
-    if (strKeyword == dcm::keyword::kStX)
+    if (strKeyword == dcm::keyword::kStX) {
         m_listAxis.push_back(dValue);
-    else if (strKeyword == dcm::keyword::kWert)
+    } else if (strKeyword == dcm::keyword::kWert) {
         m_listValues.push_back(dValue);
+    }
 }
 
 DCMFestkennlinie::DCMFestkennlinie()

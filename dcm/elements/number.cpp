@@ -33,9 +33,8 @@ constexpr bool IsDigit(char c)
 bool TakeSign(std::string_view& text)
 {
     const bool negative = text.starts_with('-');
-    if (negative || text.starts_with('+')) {
+    if (negative || text.starts_with('+'))
         text.remove_prefix(1);
-    }
     return negative;
 }
 
@@ -46,12 +45,10 @@ std::string_view SpecialName(std::uint64_t bits)
 {
     constexpr std::uint64_t quietBit = 0x0008'0000'0000'0000;
     constexpr std::uint64_t defaultNotANumber = kSignBit | kInfinityBits | quietBit;
-    if ((bits & ~kSignBit) == kInfinityBits) {
+    if ((bits & ~kSignBit) == kInfinityBits)
         return kInfinityName;
-    }
-    if (bits == defaultNotANumber) {
+    if (bits == defaultNotANumber)
         return "1.#IND";
-    }
     return (bits & quietBit) != 0 ? "1.#QNAN" : "1.#SNAN";
 }
 
@@ -121,9 +118,8 @@ void WriteBeforePoint(const Digits& digits, int point, char* to)
 /// The exponent at the start of `text`, "e" included; 0 when there is none.
 std::int64_t Exponent(std::string_view text)
 {
-    if (!text.starts_with('e') && !text.starts_with('E')) {
+    if (!text.starts_with('e') && !text.starts_with('E'))
         return 0;
-    }
     text.remove_prefix(1);
     const bool negative = TakeSign(text);
     std::int64_t exponent = 0;
@@ -139,12 +135,10 @@ std::int64_t Exponent(std::string_view text)
 double ReadToken(std::string_view token) noexcept
 {
     constexpr double infinity = std::numeric_limits<double>::infinity();
-    if (EqualsNoCase(token, kInfinityName)) {
+    if (EqualsNoCase(token, kInfinityName))
         return infinity;
-    }
-    if (token.starts_with('-') && EqualsNoCase(token.substr(1), kInfinityName)) {
+    if (token.starts_with('-') && EqualsNoCase(token.substr(1), kInfinityName))
         return -infinity;
-    }
     return ReadDecimal(token);
 }
 
@@ -246,17 +240,15 @@ inline const char* TakeFixed(const char* at, Decimal& decimal)
 const char* TakeExponent(const char* at, int& exponent)
 {
     const auto* next = at;
-    if (*next != 'e' && *next != 'E') {
+    if (*next != 'e' && *next != 'E')
         return at;
-    }
     ++next;
     const bool negative = *next == '-';
     next += negative || *next == '+' ? 1 : 0;
     std::uint64_t size = 0;
     const auto* const last = TakeDigits(next, size);
-    if (last == next || last > next + 4) {
+    if (last == next || last > next + 4)
         return at;
-    }
     exponent += negative ? -static_cast<int>(size) : static_cast<int>(size);
     return last;
 }
@@ -354,9 +346,8 @@ double ReadDecimal(std::string_view text) noexcept
         }
     }
     const bool found = i > (point ? 1 : 0);
-    if (!found) {
+    if (!found)
         return 0.0;
-    }
     const double value = decimal.Value(Exponent(token.substr(i)));
     return negative ? -value : value;
 }
@@ -364,9 +355,8 @@ double ReadDecimal(std::string_view text) noexcept
 double ReadNumber(std::string_view token) noexcept
 {
     constexpr std::size_t longest = 64;
-    if (token.size() > longest) {
+    if (token.size() > longest)
         return ReadToken(token);
-    }
     std::array<char, longest + kReadAhead> piece{};
     token.copy(piece.data(), longest);
     return ReadKnownToken(piece.data(), piece.data() + token.size());
@@ -387,15 +377,13 @@ NumberFault FaultOf(std::string_view token, double value) noexcept
         point = point || token[i] == '.';
         digits += IsDigit(token[i]) ? 1 : 0;
     }
-    if (digits == 0) {
+    if (digits == 0)
         return NumberFault::kUnreadable;
-    }
     std::string_view rest = token.substr(i);
     if (token.substr(0, i) == "1." && !rest.empty() && rest[0] == '#') {
         for (const auto name : {"QNAN"sv, "SNAN"sv, "IND"sv, "NAN"sv}) {
-            if (EqualsNoCase(rest.substr(1, name.size()), name)) {
+            if (EqualsNoCase(rest.substr(1, name.size()), name))
                 return NumberFault::kNotANumber;
-            }
         }
     }
     if (rest.starts_with('e') || rest.starts_with('E')) {
@@ -422,9 +410,8 @@ std::size_t NumberReader::Next(std::span<double> values) noexcept
         } else {
             last = std::find(at, end, ' ');
             values[count] = ReadKnownToken(at, last);
-            if (m_report != nullptr) {
+            if (m_report != nullptr)
                 m_report->Number({at, last}, values[count]);
-            }
         }
         at = last < end ? SkipWhite(last + 1, end) : nullptr;
     }
@@ -438,9 +425,8 @@ std::int32_t ReadInteger(std::string_view text) noexcept
     const bool negative = TakeSign(text);
     constexpr std::int64_t limit = std::int64_t{1} << 31;
     std::int64_t value = 0;
-    for (std::size_t i = 0; i < text.size() && IsDigit(text[i]); ++i) {
+    for (std::size_t i = 0; i < text.size() && IsDigit(text[i]); ++i)
         value = std::min(value * 10 + (text[i] - '0'), limit);
-    }
     return static_cast<std::int32_t>(negative ? -value : std::min(value, limit - 1));
 }
 

@@ -80,10 +80,11 @@ void ReadTexts(std::string_view rest, const FileText& text, const PointArray& ar
 void AppendPoint(const PointArray& array, const VARIANT& point)
 {
     CComVariant copy;
-    if (KeepsValue(point.vt))
+    if (KeepsValue(point.vt)) {
         copy = point;
-    else
+    } else {
         copy.vt = point.vt;
+    }
     AppendPoint(array, std::move(copy));
 }
 
@@ -126,10 +127,11 @@ void ReadPoints(std::string_view rest, const FileText& text, const PointArray* n
         return;
     }
     const bool mixed = array->type == VT_ERROR;
-    if (quoted)
+    if (quoted) {
         ReadTexts(rest, text, *array, report);
-    else
+    } else {
         ReadNumbers(rest, *array, report);
+    }
     if (report != nullptr && !mixed && array->type == VT_ERROR)
         report->MixedTypes();
 }
@@ -159,10 +161,11 @@ bool PointReader::Read(const BlockLine& line)
 void PointReader::Find(std::string_view keyword, Line& line) const
 {
     for (const PointTarget& target : m_targets) {
-        if (EqualsNoCase(keyword, target.keywords.numbers))
+        if (EqualsNoCase(keyword, target.keywords.numbers)) {
             line.numbers = &target.array;
-        else if (EqualsNoCase(keyword, target.keywords.texts))
+        } else if (EqualsNoCase(keyword, target.keywords.texts)) {
             line.texts = &target.array;
+        }
     }
 }
 
@@ -174,10 +177,11 @@ void CopyPoints(const std::vector<CComVariant>& points, std::vector<CComVariant>
 
 void PointLines::Add(const VARIANT& point)
 {
-    if (point.vt == VT_R8)
+    if (point.vt == VT_R8) {
         m_lines.AddNumber(m_keywords.numbers, point.dblVal, kFullDigits);
-    else if (point.vt == VT_BSTR)
+    } else if (point.vt == VT_BSTR) {
         m_lines.AddText(m_keywords.texts, CComVariant::TextOf(point), kPointText);
+    }
 }
 
 void PointLines::AddGroup(std::span<const CComVariant> points)

@@ -194,10 +194,11 @@ void Put(Parameter& parameter, DCMFestwerteblock& block)
     const auto texts = std::ranges::count(parameter.values, VT_BSTR, &CComVariant::vt);
     fields.numbers.reserve(parameter.values.size() - static_cast<std::size_t>(texts));
     for (const CComVariant& value : parameter.values) {
-        if (value.vt == VT_BSTR)
+        if (value.vt == VT_BSTR) {
             fields.texts.emplace_back(CComVariant::TextOf(value));
-        else
+        } else {
             fields.numbers.push_back(NumberOf(value).value_or(0.0));
+        }
     }
 }
 
@@ -312,7 +313,7 @@ void Add(DCMConverter& document, const Parameter& parameter)
 
 void Add(DCMConverter& document, Parameter&& parameter)
 {
-    auto kind = kKinds.begin();
+    const auto* kind = kKinds.begin();
     const auto add = [&](auto& blocks) {
         if (*kind++ == parameter.kind)
             Append(parameter, blocks);

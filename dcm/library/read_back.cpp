@@ -136,13 +136,14 @@ public:
     void NothingWritten(const Parameter& wrote)
     {
         const std::size_t wanted = wrote.x.points.size() * wrote.y.points.size();
-        if (wanted > wrote.values.size())
+        if (wanted > wrote.values.size()) {
             Add(FindingKind::kIncompleteMap, Severity::kError,
                 {L"The map has ", wrote.values.size(), L" values where its axes ask for ", wanted,
                  L"; it is not written."});
-        else
+        } else {
             Add(FindingKind::kEmptyMap, Severity::kError,
                 {L"The map has no axis points that can be written; it is not written."});
+        }
     }
 
     void Add(FindingKind kind, Severity severity, std::initializer_list<MessagePart> message)
@@ -172,12 +173,14 @@ private:
             same = isReplaced || isLacking || from == to;
         }
         const auto quoted = [](std::wstring_view text) { return MessagePart::Quoted(text); };
-        if (same && replaced)
+        if (same && replaced) {
             Add(FindingKind::kCharacterReplaced,
                 {L"Control characters in ", quoted(wrote), L" are written as other characters."});
-        if (same && lacking)
+        }
+        if (same && lacking) {
             Add(FindingKind::kNotInCodePage,
                 {L"Characters of ", quoted(wrote), L" are not in the code page and are lost."});
+        }
         if (same)
             return;
         const bool trimmed = Trimmed(wrote) == Trimmed(read);
@@ -192,37 +195,41 @@ private:
         CompareText(wrote.unit, read.unit, TextRole::kAttribute);
         // A name that was read is not blank, so a blank one was set.
         const bool blank = wrote.distribution.View().find_first_not_of(L' ') == std::wstring::npos;
-        if (!blank && read.distribution.IsEmpty())
+        if (!blank && read.distribution.IsEmpty()) {
             Add(FindingKind::kReferenceNotWritten,
                 {L"The name of the distribution ", MessagePart::Quoted(wrote.distribution),
                  L" is not written, as it was not set for export."});
-        else
+        } else {
             CompareText(wrote.distribution, read.distribution, TextRole::kName);
+        }
         CompareItems(wrote.points, read.points);
     }
 
     void CompareSingle(const std::vector<CComVariant>& wrote, const std::vector<CComVariant>& read)
     {
-        if (wrote.empty())
+        if (wrote.empty()) {
             Add(FindingKind::kNoValue, {L"The block has no value; it is written with 0.0."});
-        else if (read.empty() || wrote.front().vt == read.front().vt || IsNumber(wrote.front()))
+        } else if (read.empty() || wrote.front().vt == read.front().vt || IsNumber(wrote.front())) {
             CompareItems(wrote, read);
+        }
         // Otherwise a truth word, which was reported when it was read back.
     }
 
     void CompareList(const Parameter& wrote, const Parameter& read)
     {
         const auto numbers = Chosen(wrote.values, IsNumber), texts = Chosen(wrote.values, IsText);
-        if (!numbers.empty() && !texts.empty())
+        if (!numbers.empty() && !texts.empty()) {
             Add(FindingKind::kNumbersAndTexts, Severity::kError,
                 {L"The block has numbers and texts; its ", texts.size(),
                  L" texts are not written."});
+        }
         CompareItems(numbers.empty() ? texts : numbers, read.values);
-        if (wrote.countX != read.countX || wrote.countY != read.countY)
+        if (wrote.countX != read.countX || wrote.countY != read.countY) {
             Add(FindingKind::kCountDiffers,
                 {L"The counts ", std::int64_t{wrote.countX}, L" and ", std::int64_t{wrote.countY},
                  L" are read back as ", std::int64_t{read.countX}, L" and ",
                  std::int64_t{read.countY}, L"."});
+        }
     }
 
     void CompareItems(const std::vector<CComVariant>& wrote, const std::vector<CComVariant>& read)
@@ -234,22 +241,25 @@ private:
                 ++unwritten;
             } else if (at < read.size() && item.vt == read[at].vt) {
                 // An empty text that was dropped; those after it take its place.
-                if (IsText(item) && TextOf(item).empty() && !TextOf(read[at]).empty())
+                if (IsText(item) && TextOf(item).empty() && !TextOf(read[at]).empty()) {
                     EmptyTextDropped();
-                else
+                } else {
                     CompareItem(item, read[at++]);
+                }
             } else if (IsText(item) && TextOf(item).empty()) {
                 EmptyTextDropped();
             } else {
                 shifted = true;
             }
         }
-        if (unwritten > 0)
+        if (unwritten > 0) {
             Add(FindingKind::kValueNotWritten,
                 {unwritten, L" entries are neither number nor text and are not written."});
-        if (shifted || at != read.size())
+        }
+        if (shifted || at != read.size()) {
             Add(FindingKind::kTextAltered,
                 {wrote.size() - unwritten, L" items are read back as ", read.size(), L" others."});
+        }
     }
 
     void EmptyTextDropped()
@@ -263,11 +273,12 @@ private:
             return CompareText(TextOf(wrote), TextOf(read), TextRole::kValue);
         if (std::bit_cast<std::uint64_t>(wrote.dblVal) == std::bit_cast<std::uint64_t>(read.dblVal))
             return;
-        if (std::isnan(wrote.dblVal))
+        if (std::isnan(wrote.dblVal)) {
             Add(FindingKind::kLostNan, {L"A value is not a number and is read back as 1 or -1."});
-        else
+        } else {
             Add(FindingKind::kDigitsDropped,
                 {L"A value needs more digits than the 15 that rows are written with."});
+        }
     }
 
     FindingList& m_findings;
@@ -308,13 +319,15 @@ public:
     {
         Guard([&] {
             if (!m_document.GetComment().IsEmpty() &&
-                m_document.GetComment() != m_read.GetComment())
+                m_document.GetComment() != m_read.GetComment()) {
                 m_findings.Add(FindingKind::kDroppedComment, Severity::kNote, 0, {},
                                {L"The comment of the document is not in its header text."});
+            }
             const double version = DocumentIo::Version(m_document);
-            if (version != 0.0 && version != 2.0)
+            if (version != 0.0 && version != 2.0) {
                 m_findings.Add(FindingKind::kVersionNotKept, Severity::kNote, 0, {},
                                {L"Files are written as version 2.0, whatever was set."});
+            }
         });
     }
 
@@ -328,16 +341,18 @@ public:
             label.Append(L" ").Append(wrote.name);
             const bool written = Read(file);
             Comparer comparer(m_findings, written ? line : 0, label);
-            if (HasUnwrittenNumbers(block))
+            if (HasUnwrittenNumbers(block)) {
                 comparer.Add(FindingKind::kValueNotWritten,
                              {L"Numbers that were added with a keyword are not written."});
+            }
             if (!written)
                 return comparer.NothingWritten(wrote);
             const std::vector<Parameter> read = ParametersOf(m_read);
-            if (read.size() != 1 || read.front().kind != wrote.kind)
+            if (read.size() != 1 || read.front().kind != wrote.kind) {
                 return comparer.Add(FindingKind::kTextAltered, Severity::kError,
                                     {L"The block is read back as ", read.size(),
                                      L" blocks, or as one of another kind."});
+            }
             comparer.Compare(wrote, read.front());
             m_report.Keep(block, static_cast<std::size_t>(wrote.kind), line, 0, false);
         });
@@ -380,9 +395,10 @@ private:
             if (!more)
                 break;
             DocumentIo::Read(m_read, block, &m_report, false);
-            if (m_report.Block().Stored() != nullptr)
+            if (m_report.Block().Stored() != nullptr) {
                 m_report.CompareAxes(*m_report.Block().Stored(), m_report.Block().Kind(),
                                      m_report.Block().FirstLine());
+            }
         }
         m_report.Unfinished(block, rest.empty());
         return true;

@@ -98,12 +98,13 @@ void AddFileFailure(FindingList& findings, FileStage stage, Direction direction,
     const auto add = [&](FindingKind kind, std::wstring_view what) {
         findings.Add(kind, Severity::kError, 0, {}, {what, WordsOf(error)});
     };
-    if (stage == FileStage::kOpening)
+    if (stage == FileStage::kOpening) {
         add(FindingKind::kCannotOpen, L"The file cannot be opened");
-    else if (direction == Direction::kImport)
+    } else if (direction == Direction::kImport) {
         add(FindingKind::kCannotRead, L"The file cannot be read");
-    else
+    } else {
         add(FindingKind::kCannotWrite, L"The file cannot be written");
+    }
 }
 
 /// The failure of an open file for which the system does not answer.
@@ -127,9 +128,10 @@ HRESULT Run(FindingList& findings, Direction direction, Work work) noexcept
         if (findings.CountOf(FindingKind::kOutOfMemory) == 0)
             findings.Add(FindingKind::kOutOfMemory, Severity::kError, 0, {}, {L"Memory ran out."});
     } catch (...) {
-        if (findings.CountOf(FindingKind::kStopped) == 0)
+        if (findings.CountOf(FindingKind::kStopped) == 0) {
             findings.Add(FindingKind::kStopped, Severity::kError, 0, {},
                          {L"The work ended early."});
+        }
     }
     return E_UNEXPECTED;
 }
