@@ -41,7 +41,7 @@ void ImportReport::BeginText(const FileText& text, std::int32_t number) noexcept
     const std::size_t zero = bytes.find('\0');
     std::string_view read = bytes.substr(0, zero);
     const FileText::Origin& origin = text.OriginOfBytes();
-    if (origin.textAfterZero || HasTextAfterZero(bytes)) {
+    if (origin.textAfterZero || (zero != bytes.npos && HasTextAfterZero(bytes))) {
         Add(FindingKind::kTextAfterZero, Severity::kError, LineAt(read, read.npos, number), {},
             {L"A zero byte ends the text; what follows it in the file is not read."});
     }
@@ -159,36 +159,31 @@ void ImportReport::SetDistributions(const DCMConverter& document)
 
 void ImportReport::CompareAxes(const DCMBaseType& block, std::size_t kind, std::int64_t line)
 {
-    const CString label = LabelOf(block, kind);
-    std::vector<CComVariant> points;
+    const auto compare = [&](std::wstring_view name, auto getPoints) {
+        if (name.empty())
+            return;
+        const auto found = m_distributions.find(name);
+        if (found == m_distributions.end()) {
+            Add(FindingKind::kUnknownDistribution, Severity::kNote, line, LabelOf(block, kind),
+                {L"There is no distribution ", MessagePart::Quoted(name), L"."});
+            return;
+        }
+        std::vector<CComVariant> points, shared;
+        getPoints(points);
+        if (points.empty())
+            return;
+        found->second->GetValues(shared);
+        if (!std::ranges::equal(points, shared, SamePoint)) {
+            Add(FindingKind::kDistributionDiffers, Severity::kWarning, line, LabelOf(block, kind),
+                {L"The axis points differ from those of the distribution ",
+                 MessagePart::Quoted(name), L"."});
+        }
+    };
     if (const auto* const curve = dynamic_cast<const DCMKennlinie*>(&block)) {
-        curve->GetAxis(points);
-        CompareAxis(curve->GetStuetzstellenverteilung(), points, label, line);
+        compare(curve->GetStuetzstellenverteilung(), [&](auto& points) { curve->GetAxis(points); });
     } else if (const auto* const map = dynamic_cast<const DCMKennfeld*>(&block)) {
-        map->GetAxis_X(points);
-        CompareAxis(map->GetStuetzstellenverteilungX(), points, label, line);
-        map->GetAxis_Y(points);
-        CompareAxis(map->GetStuetzstellenverteilungY(), points, label, line);
-    }
-}
-
-void ImportReport::CompareAxis(std::wstring_view name, const std::vector<CComVariant>& points,
-                               const CString& label, std::int64_t line)
-{
-    if (name.empty())
-        return;
-    const auto found = m_distributions.find(name);
-    if (found == m_distributions.end()) {
-        Add(FindingKind::kUnknownDistribution, Severity::kNote, line, label,
-            {L"There is no distribution ", MessagePart::Quoted(name), L"."});
-        return;
-    }
-    std::vector<CComVariant> shared;
-    found->second->GetValues(shared);
-    if (!points.empty() && !std::ranges::equal(points, shared, SamePoint)) {
-        Add(FindingKind::kDistributionDiffers, Severity::kWarning, line, label,
-            {L"The axis points differ from those of the distribution ", MessagePart::Quoted(name),
-             L"."});
+        compare(map->GetStuetzstellenverteilungX(), [&](auto& points) { map->GetAxis_X(points); });
+        compare(map->GetStuetzstellenverteilungY(), [&](auto& points) { map->GetAxis_Y(points); });
     }
 }
 

@@ -61,8 +61,6 @@ private:
     };
 
     void CompareNames();
-    void CompareAxis(std::wstring_view name, const std::vector<CComVariant>& points,
-                     const CString& label, std::int64_t line);
     static CString LabelOf(const DCMBaseType& block, std::size_t kind);
     void Add(FindingKind kind, Severity severity, std::int64_t line, const CString& block,
              std::initializer_list<MessagePart> message) noexcept

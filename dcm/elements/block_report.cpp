@@ -49,6 +49,15 @@ std::string_view Meant(std::string_view rest)
     return text;
 }
 
+/// Whether the text can begin with the keyword of a kind. Size and second letter rule out most
+/// lines.
+bool MayBeKind(std::string_view text)
+{
+    constexpr std::size_t shortest = 8;
+    constexpr std::string_view second = "ETRetr";
+    return text.size() >= shortest && second.find(text[1]) != second.npos;
+}
+
 bool IsBlank(std::string_view text)
 {
     return TrimWhite(text).empty();
@@ -58,8 +67,7 @@ bool IsBlank(std::string_view text)
 
 bool IsKindKeyword(std::string_view word)
 {
-    constexpr std::size_t shortest = 8;
-    return word.size() >= shortest && IsOneOf(word, kKindKeywords);
+    return MayBeKind(word) && IsOneOf(word, kKindKeywords);
 }
 
 std::string_view WordOf(std::string_view text)
@@ -292,8 +300,7 @@ void BlockReport::KeywordLine(std::size_t index, std::string_view keyword, std::
 
 bool BlockReport::LookForKind(std::size_t index, std::string_view keyword)
 {
-    constexpr std::size_t shortest = 8;
-    return keyword.size() >= shortest && LookForKind(index);
+    return MayBeKind(keyword) && LookForKind(index);
 }
 
 void BlockReport::OtherLine(std::size_t index, std::string_view bytes)
@@ -422,7 +429,7 @@ void BlockReport::Reference()
         (EqualsNoCase(m_keyword, keyword::kSstX) ? m_referenceX : m_referenceY) = true;
 }
 
-void BlockReport::SingleNumber(std::string_view token)
+void BlockReport::SingleNumber(std::string_view token, double value)
 {
     SingleValue();
     if (token.empty())
@@ -431,7 +438,7 @@ void BlockReport::SingleNumber(std::string_view token)
         Add(FindingKind::kTextAltered,
             {L"The quotes around the number ", Quote(token), L" are not kept."});
     }
-    Number(token, ReadNumber(token));
+    Number(token, value);
 }
 
 void BlockReport::SingleText(std::string_view kept)

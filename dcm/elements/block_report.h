@@ -101,7 +101,7 @@ public:
     /// The name of a distribution, kept as it is.
     void Reference();
     /// The single value of a block: a number, a text or a truth word.
-    void SingleNumber(std::string_view token);
+    void SingleNumber(std::string_view token, double value);
     void SingleText(std::string_view kept);
     void TruthWord();
     /// One number of a line was read from `token` as `value`.

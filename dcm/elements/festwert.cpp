@@ -61,9 +61,10 @@ void ReadValueText(std::string_view part, const dcm::FileText& text, dcm::BlockR
 
 double ReadValueNumber(std::string_view token, dcm::BlockReport* report)
 {
+    const double value = dcm::ReadNumber(token);
     if (report != nullptr)
-        report->SingleNumber(token);
-    return dcm::ReadNumber(token);
+        report->SingleNumber(token, value);
+    return value;
 }
 
 } // namespace

@@ -127,10 +127,8 @@ void ReadCounts(std::string_view counts, const dcm::FileText& text, std::int32_t
 /// Compares the counts of the first line, `declared`, with what was read of them and with the
 /// values.
 void ReportValues(dcm::BlockReport& report, std::string_view declared,
-                  const DCMFestwerteblock& block)
+                  const DCMFestwerteblock& block, std::size_t numbers, std::size_t texts)
 {
-    const std::size_t numbers = block.GetDoubleValues().size();
-    const std::size_t texts = block.GetStringValues().size();
     const std::size_t values = numbers > 0 ? numbers : texts;
     if (numbers > 0 && texts > 0) {
         report.AddToBlock(
@@ -208,7 +206,8 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwerteblock& block)
         }
     }
     if (report != nullptr)
-        ReportValues(*report, declared, block);
+        ReportValues(*report, declared, block, block.m_vecDoubleValues.size(),
+                     block.m_listStringValues.size());
     return S_OK;
 }
 
