@@ -26,6 +26,12 @@ int main(int argc, char** argv)
         const auto import = [&] { return dcm::Import(document, CString(argv[2]), report); };
         if (Timed(seconds, import) != S_OK)
             return EXIT_FAILURE;
+    } else if (argv[1] == std::string_view("report")) {
+        DCMConverter document;
+        dcm::Report report;
+        const CString path(argv[2]);
+        if (Timed(seconds, [&] { return dcm::Import(document, path, report); }) != S_OK)
+            return EXIT_FAILURE;
     } else {
         DCMConverter document;
         if (Timed(seconds, [&] { return document.Import(CString(argv[2])); }) != S_OK)

@@ -67,6 +67,9 @@ int Main(std::string_view what, const char* path)
     DCMConverter document;
     if (what == "import") {
         Counted([&] { document.Import(file); });
+    } else if (what == "report") {
+        dcm::Report report;
+        Counted([&] { dcm::Import(document, file, report); });
     } else if (what == "export") {
         document.Import(file);
         const TemporaryFolder folder;

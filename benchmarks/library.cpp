@@ -72,6 +72,18 @@ const TakesPart kImport("import/dcm", [](const Stage& stage) {
     return outcome;
 });
 
+const TakesPart kImportWithReport("import/report", [](const Stage& stage) {
+    Outcome outcome;
+    DCMConverter document;
+    dcm::Report report;
+    const CString path(stage.dcmFile.c_str());
+    if (Timed(outcome.seconds, [&] { return Import(document, path, report); }) != S_OK ||
+        report.Count(dcm::Severity::kError) + report.Count(dcm::Severity::kWarning) != 0)
+        throw std::runtime_error("the file is not clean");
+    outcome.checksum = ChecksumOf(document);
+    return outcome;
+});
+
 const TakesPart kExport("export/dcm", [](const Stage& stage) {
     Outcome outcome;
     const CString path(stage.outputFile.c_str());
