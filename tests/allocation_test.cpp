@@ -1,57 +1,16 @@
-// Each allocation in the library's calls fails once. The operators here make all allocations of the
-// test executable.
+// Each allocation in the library's calls fails once.
+#include "tests/allocations.h"
 #include "tests/support.h"
 
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <atomic>
-#include <cstdlib>
 #include <functional>
 #include <new>
 #include <span>
 #include <vector>
 
 using namespace test;
-
-namespace {
-
-/// The number of allocations that have not been released.
-constinit std::atomic<long> live = 0;
-/// The thread's allocation that fails, counted from now; 0 or less for none.
-constinit thread_local long untilFailure = 0;
-/// The number of bytes that the thread has requested.
-constinit thread_local std::size_t wanted = 0;
-
-} // namespace
-
-// If they were inlined, the compiler would warn that memory from one function is released by
-// another.
-[[gnu::noinline]] void* operator new(std::size_t size, const std::nothrow_t&) noexcept
-{
-    wanted += size;
-    void* const memory = --untilFailure == 0 ? nullptr : std::malloc(size == 0 ? 1 : size);
-    live += memory != nullptr ? 1 : 0;
-    return memory;
-}
-
-[[gnu::noinline]] void* operator new(std::size_t size)
-{
-    if (void* const memory = operator new(size, std::nothrow))
-        return memory;
-    throw std::bad_alloc();
-}
-
-[[gnu::noinline]] void operator delete(void* memory) noexcept
-{
-    live -= memory != nullptr ? 1 : 0;
-    std::free(memory);
-}
-
-[[gnu::noinline]] void operator delete(void* memory, std::size_t) noexcept
-{
-    operator delete(memory);
-}
 
 namespace {
 
