@@ -28,7 +28,7 @@ constexpr struct
 unsigned NumberAtEnd(std::string_view digits)
 {
     unsigned number = 0;
-    const auto end = digits.data() + digits.size();
+    const auto* const end = digits.data() + digits.size();
     const auto [stop, error] = std::from_chars(digits.data(), end, number);
     return stop == end && error == std::errc() ? number : 0;
 }
@@ -40,18 +40,21 @@ unsigned IdentifierOf(std::string_view name)
         return 65001;
     if (name == "latin1" || name == "latin-1")
         return 28591;
-    for (const auto& [prefix, offset] : kNumbered)
-        if (name.starts_with(prefix))
+    for (const auto& [prefix, offset] : kNumbered) {
+        if (name.starts_with(prefix)) {
             if (const unsigned number = NumberAtEnd(name.substr(prefix.size())))
                 return number + offset;
+        }
+    }
     return 0;
 }
 
 std::string LowerCase(std::string text)
 {
-    for (char& character : text)
+    for (char& character : text) {
         if (character >= 'A' && character <= 'Z')
             character = static_cast<char>(character + ('a' - 'A'));
+    }
     return text;
 }
 
@@ -60,9 +63,10 @@ std::string LowerCase(std::string text)
 void ChooseCodePage(const std::string& name)
 {
     const unsigned identifier = IdentifierOf(LowerCase(name));
-    if (identifier == 0 || !SetThreadCodePage(identifier))
+    if (identifier == 0 || !SetThreadCodePage(identifier)) {
         throw Trouble("unknown code page " + Shown(name) +
                       "; give utf-8, iso-8859-1 or a number such as 1252");
+    }
 }
 
 } // namespace dcm::tools

@@ -31,10 +31,11 @@ Comparison ComparisonOf(const std::vector<std::string>& tolerances,
 {
     Comparison comparison;
     for (const std::string_view text : tolerances) {
-        if (text.ends_with('%'))
+        if (text.ends_with('%')) {
             comparison.relative = ToleranceOf(text.substr(0, text.size() - 1), text) * kPercent;
-        else
+        } else {
             comparison.absolute = ToleranceOf(text, text);
+        }
     }
     const auto isIgnored = [&ignored](std::string_view what) {
         return std::find(ignored.begin(), ignored.end(), what) != ignored.end();

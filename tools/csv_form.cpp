@@ -45,10 +45,11 @@ public:
             m_text.append(character == '"' ? 2 : 1, character);
         if (quoted)
             m_text += '"';
-        if (last)
+        if (last) {
             m_text += "\r\n";
-        else
+        } else {
             m_text += m_style.separator;
+        }
     }
 
 private:

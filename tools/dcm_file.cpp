@@ -34,9 +34,10 @@ void SaveFile(const DCMConverter& document, const std::string& path)
     Report report;
     if (SUCCEEDED(Save(document, FromUtf8(path), report)))
         return;
-    for (const Finding& finding : report.Findings())
+    for (const Finding& finding : report.Findings()) {
         if (finding.severity == Severity::kError)
             throw Trouble(Shown(path) + ": " + Shown(finding.message.View()));
+    }
     throw Trouble(Shown(path) + ": cannot write the file");
 }
 

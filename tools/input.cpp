@@ -34,9 +34,10 @@ std::string WithoutPath(std::string words, const InputFile& file)
 [[noreturn]] void ThrowNothingRead(const InputFile& file, const Report& report)
 {
     const std::string label = Shown(file.Label()) + ": ";
-    for (const Finding& finding : report.Findings())
+    for (const Finding& finding : report.Findings()) {
         if (std::find(kNothingRead.begin(), kNothingRead.end(), finding.id) != kNothingRead.end())
             throw Trouble(label + Shown(WithoutPath(ToUtf8(finding.message.View()), file)));
+    }
     throw Trouble(label + "cannot read the file");
 }
 
@@ -66,9 +67,10 @@ bool HasKnownLine(const CString& path)
     CString line;
     if (file.Open(path, CFile::modeRead) == FALSE)
         return false;
-    while (file.ReadLine(line) != FALSE)
+    while (file.ReadLine(line) != FALSE) {
         if (IsKnownLine(line.View()))
             return true;
+    }
     return false;
 }
 
@@ -100,9 +102,10 @@ Input ReadInput(const InputFile& file, std::size_t limit)
     input.complete = SUCCEEDED(Import(input.document, path, input.report));
     if (CannotRead(input.report))
         ThrowNothingRead(file, input.report);
-    if (!HasBlocks(input.document) && !HasKnownLine(path))
+    if (!HasBlocks(input.document) && !HasKnownLine(path)) {
         throw Trouble(Shown(input.label) +
                       ": not a DCM file: it has neither a known block nor a version line");
+    }
     if (input.report.Count("looks-like-utf-8") > 0)
         Complain(Shown(input.label) + ": looks like UTF-8; read it with --code-page utf-8");
     return input;
@@ -123,9 +126,10 @@ std::size_t ErrorsOf(const Input& input)
 
 void TellErrors(const Input& input)
 {
-    if (const std::size_t errors = ErrorsOf(input))
+    if (const std::size_t errors = ErrorsOf(input)) {
         Complain(Shown(input.label) + ": " + Counted(errors, "error") + "; dcm check shows " +
                  (errors == 1 ? "it" : "them"));
+    }
 }
 
 void RequireOneStandardInput(const std::vector<std::string>& arguments)

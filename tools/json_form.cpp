@@ -41,11 +41,12 @@ std::vector<std::uint32_t> CharactersOf(std::wstring_view text)
             static_cast<std::uint32_t>(static_cast<std::make_unsigned_t<wchar_t>>(character));
         const bool low = number >= kFirstLow && number < kAfterLow;
         if (kHasPairs && low && !characters.empty() && characters.back() >= kFirstHigh &&
-            characters.back() < kFirstLow)
+            characters.back() < kFirstLow) {
             characters.back() =
                 kFirstBeyondBmp + ((characters.back() - kFirstHigh) << 10U) + (number - kFirstLow);
-        else
+        } else {
             characters.push_back(number);
+        }
     }
     return characters;
 }
@@ -95,10 +96,12 @@ void RequireMembers(const Place& place, std::initializer_list<std::string_view> 
 {
     if (!place.json.is_object())
         place.Expect("an object");
-    for (const auto& [name, member] : place.json.items())
-        if (std::find(known.begin(), known.end(), name) == known.end())
+    for (const auto& [name, member] : place.json.items()) {
+        if (std::find(known.begin(), known.end(), name) == known.end()) {
             throw Trouble((place.name.empty() ? "the document" : place.name) +
                           ": unknown member \"" + Shown(std::string_view(name)) + "\"");
+        }
+    }
 }
 
 std::int64_t IntegerOf(const Place& place, std::int64_t least, std::int64_t most)

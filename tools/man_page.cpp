@@ -14,12 +14,13 @@ std::string Escaped(std::string_view text)
 {
     std::string escaped;
     for (const char character : text) {
-        if (character == '\\')
+        if (character == '\\') {
             escaped += "\\e";
-        else if (character == '-')
+        } else if (character == '-') {
             escaped += "\\-";
-        else
+        } else {
             escaped += character;
+        }
     }
     return escaped.starts_with('.') || escaped.starts_with('\'') ? "\\&" + escaped : escaped;
 }
@@ -45,9 +46,10 @@ std::string Synopsis(const CLI::App& command)
 {
     std::string line = "\\fBdcm " + Escaped(command.get_name()) + "\\fR [\\fIOPTIONS\\fR]";
     for (const CLI::Option* option : command.get_options()) {
-        if (option->get_required() && !IsPositional(*option))
+        if (option->get_required() && !IsPositional(*option)) {
             line += " \\fB\\-" + option->get_snames().front() + "\\fR \\fI" +
                     option->get_type_name() + "\\fR";
+        }
         if (!IsPositional(*option))
             continue;
         const std::string more = option->get_expected_max() > 1 ? "..." : "";
@@ -61,10 +63,12 @@ std::string CommandText(const CLI::App& command)
 {
     std::string text =
         ".SS " + Synopsis(command) + "\n" + Escaped(command.get_description()) + ".\n";
-    for (const CLI::Option* option : command.get_options())
-        if (!option->get_group().empty())
+    for (const CLI::Option* option : command.get_options()) {
+        if (!option->get_group().empty()) {
             text +=
                 ".TP\n" + OptionTitle(*option) + "\n" + Escaped(option->get_description()) + "\n";
+        }
+    }
     if (!command.get_footer().empty())
         text += ".PP\n" + Escaped(command.get_footer()) + "\n";
     return text;

@@ -121,9 +121,10 @@ void Patterns::RequireMatches(std::span<const Parameter> parameters, const std::
                                        [&pattern](const Parameter& parameter) {
                                            return Matches(parameter.name.View(), pattern.View());
                                        });
-        if (!found)
+        if (!found) {
             throw Trouble(where + ": no parameter is named " + Shown(pattern.View()) +
                           Question(NearestNames(pattern.View(), parameters)));
+        }
     }
 }
 

@@ -25,7 +25,7 @@ std::string NanText(double number)
     if (bits == kUsualNan)
         return "nan";
     char digits[kDigits];
-    const auto end = std::to_chars(digits, std::end(digits), bits, 16).ptr;
+    auto* const end = std::to_chars(digits, std::end(digits), bits, 16).ptr;
     std::string text(kNanWithBits);
     text.append(kDigits - static_cast<std::size_t>(end - digits), '0');
     return text.append(digits, end);
@@ -34,7 +34,7 @@ std::string NanText(double number)
 std::optional<double> NanOf(std::string_view digits)
 {
     std::uint64_t bits = 0;
-    const auto end = digits.data() + digits.size();
+    const auto* const end = digits.data() + digits.size();
     const auto [stop, error] = std::from_chars(digits.data(), end, bits, 16);
     const auto number = std::bit_cast<double>(bits);
     if (digits.size() != kDigits || stop != end || error != std::errc() || !std::isnan(number))
@@ -56,7 +56,7 @@ std::string ShortNumberText(double number)
 {
     constexpr int kShortDigits = 6;
     char digits[32];
-    const auto end =
+    auto* const end =
         std::to_chars(digits, std::end(digits), number, std::chars_format::general, kShortDigits)
             .ptr;
     return {digits, end};
@@ -69,7 +69,7 @@ std::optional<double> NumberOf(std::string_view text)
     if (text.starts_with(kNanWithBits))
         return NanOf(text.substr(kNanWithBits.size()));
     double number = 0.0;
-    const auto end = text.data() + text.size();
+    const auto* const end = text.data() + text.size();
     const auto [stop, error] = std::from_chars(text.data(), end, number);
     // What is left are other spellings of not-a-number.
     if (text.empty() || stop != end || error != std::errc() || std::isnan(number))

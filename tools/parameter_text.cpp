@@ -55,13 +55,15 @@ std::string TitleOf(const Parameter& parameter)
 
 std::string SizeText(const Parameter& parameter)
 {
-    if (IsMap(parameter.kind))
+    if (IsMap(parameter.kind)) {
         return std::to_string(parameter.x.points.size()) + " x " +
                std::to_string(parameter.y.points.size());
+    }
     const std::size_t count = ContentOf(parameter).size();
-    if (parameter.columns != 0 && parameter.columns < count)
+    if (parameter.columns != 0 && parameter.columns < count) {
         return std::to_string(parameter.columns) + " x " +
                std::to_string((count + parameter.columns - 1) / parameter.columns);
+    }
     return std::to_string(count);
 }
 

@@ -61,7 +61,7 @@ bool IsControl(std::uint32_t character)
 void AppendNumber(std::string& to, std::uint32_t character)
 {
     char digits[8];
-    const auto end = std::to_chars(digits, std::end(digits), character, 16).ptr;
+    auto* const end = std::to_chars(digits, std::end(digits), character, 16).ptr;
     to += "\\x";
     if (end - digits == 1)
         to += '0';
@@ -82,10 +82,11 @@ std::string Shown(std::string_view text)
     while (!text.empty()) {
         const std::string_view before = text;
         const std::uint32_t character = TakeCharacter(text);
-        if (IsControl(character))
+        if (IsControl(character)) {
             AppendNumber(shown, character);
-        else
+        } else {
             shown += before.substr(0, before.size() - text.size());
+        }
     }
     return shown;
 }
@@ -95,10 +96,11 @@ std::size_t Width(std::string_view text)
     std::size_t width = 0;
     while (!text.empty()) {
         const std::uint32_t character = TakeCharacter(text);
-        if (IsIn(character, kWide))
+        if (IsIn(character, kWide)) {
             width += 2;
-        else if (!IsIn(character, kCombining))
+        } else if (!IsIn(character, kCombining)) {
             ++width;
+        }
     }
     return width;
 }

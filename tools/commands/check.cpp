@@ -44,25 +44,28 @@ Checked CheckFile(const std::string& argument, const CheckOptions& options, Prog
 
 void PrintText(const Checked& checked)
 {
-    for (const Report* report : checked.Reports())
+    for (const Report* report : checked.Reports()) {
         for (const Finding& finding : report->Findings())
             Print(FindingText(checked.label, finding, Painted) + '\n');
-    if (checked.Incomplete())
+    }
+    if (checked.Incomplete()) {
         Complain(Shown(checked.label) + ": not all findings are listed; there are " +
                  Counted(checked.Count(Severity::kError), "error") + ", " +
                  Counted(checked.Count(Severity::kWarning), "warning") + " and " +
                  Counted(checked.Count(Severity::kNote), "note"));
+    }
 }
 
 Json JsonOfFindings(const Report& report)
 {
     Json findings = Json::array();
-    for (const Finding& finding : report.Findings())
+    for (const Finding& finding : report.Findings()) {
         findings.push_back({{"severity", ToUtf8(NameOf(finding.severity))},
                             {"id", finding.id},
                             {"line", finding.line},
                             {"block", ToUtf8(finding.block.View())},
                             {"message", ToUtf8(finding.message.View())}});
+    }
     return findings;
 }
 
@@ -97,10 +100,11 @@ int Check(const CheckOptions& options)
         try {
             const Checked checked = CheckFile(file, options, progress);
             progress.Pause();
-            if (options.json)
+            if (options.json) {
                 files.push_back(JsonOf(checked));
-            else
+            } else {
                 PrintText(checked);
+            }
             result = std::max(result, Fails(checked, options.failOn) ? 1 : 0);
         } catch (const Trouble& trouble) {
             progress.Pause();
@@ -108,9 +112,10 @@ int Check(const CheckOptions& options)
             result = kTrouble;
         }
     }
-    if (options.json)
+    if (options.json) {
         Print(JsonText({{"format", "dcm-check"}, {"version", 1}, {"files", std::move(files)}}) +
               '\n');
+    }
     return result;
 }
 

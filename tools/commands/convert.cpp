@@ -104,9 +104,10 @@ bool WriteDcm(Content&& content, const std::string& out)
 {
     const DCMConverter document = DocumentOf(std::move(content.parameters), content.comment);
     const Report report = ReportOfExport(document, kFindingsPerId);
-    for (const Finding& finding : report.Findings())
+    for (const Finding& finding : report.Findings()) {
         if (finding.severity != Severity::kNote)
             Complain(FindingText(out, finding, Plain));
+    }
     SaveFile(document, out);
     return report.Count(Severity::kError) == 0;
 }
@@ -138,12 +139,13 @@ int Convert(const ConvertOptions& options)
 
     Content content = ContentOf(options);
     bool whole = content.whole;
-    if (form == Form::kDcm)
+    if (form == Form::kDcm) {
         whole &= WriteDcm(std::move(content), options.out);
-    else if (form == Form::kJson)
+    } else if (form == Form::kJson) {
         WriteWholeFile(options.out, JsonText(content.comment, content.parameters));
-    else
+    } else {
         WriteWholeFile(options.out, CsvText(content.parameters, style));
+    }
     return whole ? 0 : 1;
 }
 

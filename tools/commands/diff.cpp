@@ -82,9 +82,10 @@ std::string ChangeText(const ValueDifference& value)
 std::string FieldLines(const Difference& difference)
 {
     std::string lines;
-    for (const FieldDifference& field : difference.fields)
+    for (const FieldDifference& field : difference.fields) {
         lines += "    " + ToUtf8(KeywordOf(field.field)) + "  \"" + Shown(field.oldText.View()) +
                  "\" -> \"" + Shown(field.newText.View()) + "\"\n";
+    }
     return lines;
 }
 
@@ -107,9 +108,10 @@ std::string ValueLines(const Difference& difference, const Sides& sides)
     for (const ValueDifference& value : difference.values) {
         const Coordinates place = PlaceOf(difference, value, sides);
         std::vector<std::string> cells;
-        for (const CComVariant* point : {&place.x, &place.y})
+        for (const CComVariant* point : {&place.x, &place.y}) {
             if (point->vt != VT_EMPTY)
                 cells.push_back(ValueText(*point));
+        }
         if (!cells.empty())
             cells.back() += ':';
         cells.insert(cells.end(), {ValueText(value.oldValue), "->", ValueText(value.newValue),
@@ -146,19 +148,21 @@ std::string HeadLine(const Difference& difference, const Sides& sides, bool with
     const ChangeWord& word = WordOf(difference.change);
     std::string line = Painted(word.word, word.colour) + ' ' +
                        Painted(TitleOf(parameter), Colour::kBold) + UnitOf(parameter);
-    if (difference.change != Change::kChanged)
+    if (difference.change != Change::kChanged) {
         line += ": " + ValuesText(parameter);
-    else if (withCounts)
+    } else if (withCounts) {
         line += ": " + CountsText(difference);
+    }
     return line + '\n';
 }
 
 std::string DifferenceText(const Difference& difference, const Sides& sides, bool summary)
 {
     std::string text = HeadLine(difference, sides, summary);
-    if (!summary)
+    if (!summary) {
         text += FieldLines(difference) + PointLines("x", difference.x) +
                 PointLines("y", difference.y) + ValueLines(difference, sides);
+    }
     return text;
 }
 
@@ -172,9 +176,10 @@ std::size_t CountOf(std::span<const Difference> differences, Change change)
 std::string TotalLine(std::span<const Difference> differences)
 {
     std::string line;
-    for (const ChangeWord& word : kChangeWords)
+    for (const ChangeWord& word : kChangeWords) {
         line += (line.empty() ? "" : ", ") + std::to_string(CountOf(differences, word.change)) +
                 ' ' + std::string(word.word);
+    }
     return line + '\n';
 }
 
@@ -229,10 +234,11 @@ Json JsonOfValues(const Difference& difference, const Sides& sides)
 Json JsonOfDifference(const Difference& difference, const Sides& sides)
 {
     Json fields = Json::array();
-    for (const FieldDifference& field : difference.fields)
+    for (const FieldDifference& field : difference.fields) {
         fields.push_back({{"field", ToUtf8(KeywordOf(field.field))},
                           {"old", JsonOf(field.oldText)},
                           {"new", JsonOf(field.newText)}});
+    }
     return {{"change", WordOf(difference.change).word},
             {"kind", ToUtf8(KeywordOf(difference.kind))},
             {"name", JsonOf(difference.name)},
@@ -249,9 +255,10 @@ void PrintJson(std::span<const Difference> differences, const Sides& sides,
 {
     Print("{\"format\": \"dcm-diff\", \"version\": 1, \"old\": " + JsonText(options.oldFile) +
           ", \"new\": " + JsonText(options.newFile));
-    for (const ChangeWord& word : kChangeWords)
+    for (const ChangeWord& word : kChangeWords) {
         Print(", \"" + std::string(word.word) +
               "\": " + std::to_string(CountOf(differences, word.change)));
+    }
     if (!options.summary) {
         Print(",\n\"differences\": [");
         const char* separator = "\n";
@@ -289,10 +296,11 @@ int Diff(const DiffOptions& options)
                          ParametersOf(std::move(newInput.document))};
     const std::vector<Difference> differences =
         Differences(sides.oldParameters, sides.newParameters, comparison);
-    if (options.json)
+    if (options.json) {
         PrintJson(differences, sides, options);
-    else
+    } else {
         PrintText(differences, sides, options.summary);
+    }
     TellErrors(oldInput);
     TellErrors(newInput);
     return ExitCode(!differences.empty(), oldInput, newInput);

@@ -47,12 +47,14 @@ public:
     {
         std::vector<std::size_t>& sameName = m_indices[Key(parameter)];
         std::vector<std::size_t> same;
-        for (const std::size_t index : sameName)
+        for (const std::size_t index : sameName) {
             if (m_parameters[index].kind == parameter.kind)
                 same.push_back(index);
-        if (same.empty() && !sameName.empty())
+        }
+        if (same.empty() && !sameName.empty()) {
             throw Trouble(TitleOf(parameter) + " cannot be merged: it is there as " +
                           TitleOf(m_parameters[sameName.front()]));
+        }
         if (same.size() > 1)
             RequireForce(parameter);
         if (same.empty()) {
@@ -74,9 +76,10 @@ public:
     {
         std::vector<Parameter> all;
         all.reserve(m_parameters.size());
-        for (std::size_t i = 0; i < m_parameters.size(); ++i)
+        for (std::size_t i = 0; i < m_parameters.size(); ++i) {
             if (!m_dropped[i])
                 all.push_back(std::move(m_parameters[i]));
+        }
         return all;
     }
 
@@ -88,9 +91,10 @@ private:
 
     void RequireForce(const Parameter& parameter) const
     {
-        if (!m_force)
+        if (!m_force) {
             throw Trouble(TitleOf(parameter) +
                           " is in BASE more than once; --force replaces all of them by one");
+        }
     }
 
     void Append(Parameter&& parameter, std::vector<std::size_t>& sameName)
@@ -119,9 +123,10 @@ public:
     {
         m_variantLines += report.Count("variant-line");
         m_comments += report.Count("dropped-comment");
-        for (const Finding& finding : report.Findings())
+        for (const Finding& finding : report.Findings()) {
             if (finding.id == "unknown-block" && finding.severity == Severity::kNote)
                 ++m_blocks[FirstWord(finding.block)];
+        }
     }
 
     /// "1 FUNKTIONEN block, 3 VAR lines, 2 comments are not in OUT", or an empty text.
@@ -158,9 +163,10 @@ void RequireNoErrors(const Report& report, const std::string& label, bool force)
     const std::size_t errors = report.Count(Severity::kError);
     if (errors == 0)
         return;
-    if (!force)
+    if (!force) {
         throw Trouble(Shown(label) + ": " + Counted(errors, "error") +
                       "; nothing is written without --force; dcm check tells more");
+    }
     Complain(Shown(label) + ": " + Counted(errors, "error") + "; dcm check tells more");
 }
 
@@ -168,9 +174,10 @@ void RequireNoErrors(const Report& report, const std::string& label, bool force)
 void RequireWhole(const DCMConverter& document, const MergeOptions& options)
 {
     const Report report = ReportOfExport(document, kFindingsPerId);
-    for (const Finding& finding : report.Findings())
+    for (const Finding& finding : report.Findings()) {
         if (finding.severity == Severity::kError)
             Complain(FindingText(options.out, finding, Plain));
+    }
     if (report.Count(Severity::kError) > 0 && !options.force)
         throw Trouble(Shown(options.out) + ": nothing is written without --force");
 }

@@ -183,9 +183,10 @@ std::string LinesText(const Parameter& parameter)
         text += title + ": " + keyword + " = " + attribute + '\n';
     const bool isDistribution = parameter.kind == Kind::kStuetzstellenverteilung;
     const auto& values = isDistribution ? parameter.x.points : parameter.values;
-    for (std::size_t i = 0; i < values.size(); ++i)
+    for (std::size_t i = 0; i < values.size(); ++i) {
         text +=
             title + PlaceText(CoordinatesOf(parameter, i)) + " = " + ValueText(values[i]) + '\n';
+    }
     return values.empty() ? text + title + " = -\n" : text;
 }
 

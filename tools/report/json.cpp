@@ -35,19 +35,20 @@ void AppendJsonNumber(std::string& json, double number)
         json += number > 0 ? "1e999" : "-1e999";
     } else {
         std::array<char, 32> digits;
-        const auto end = std::to_chars(digits.data(), digits.data() + digits.size(), number).ptr;
+        auto* const end = std::to_chars(digits.data(), digits.data() + digits.size(), number).ptr;
         json.append(digits.data(), end);
     }
 }
 
 void AppendJsonValue(std::string& json, const CComVariant& value)
 {
-    if (value.vt == VT_R8)
+    if (value.vt == VT_R8) {
         AppendJsonNumber(json, value.dblVal);
-    else if (value.vt == VT_BSTR)
+    } else if (value.vt == VT_BSTR) {
         AppendJsonText(json, CComVariant::TextOf(value));
-    else
+    } else {
         json += "null";
+    }
 }
 
 } // namespace dcm::tools

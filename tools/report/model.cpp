@@ -29,9 +29,10 @@ std::vector<PageKind> PageKindsOf(std::span<const Parameter> parameters,
                                   std::span<const Difference> differences)
 {
     std::vector<const Difference*> differenceOf(parameters.size());
-    for (const Difference& difference : differences)
+    for (const Difference& difference : differences) {
         if (difference.oldIndex != kNoIndex)
             differenceOf[difference.oldIndex] = &difference;
+    }
 
     std::vector<PageKind> kinds;
     for (const auto& [kind, look] : kOrder)
@@ -46,10 +47,12 @@ std::vector<PageKind> PageKindsOf(std::span<const Parameter> parameters,
             .push_back(
                 {&parameters[i], inBoth ? &others[difference->newIndex] : nullptr, difference});
     }
-    for (const Difference& difference : differences)
-        if (difference.change == Change::kAdded)
+    for (const Difference& difference : differences) {
+        if (difference.change == Change::kAdded) {
             blocksOf(difference.kind)
                 .push_back({&others[difference.newIndex], nullptr, &difference});
+        }
+    }
     std::erase_if(kinds, [](const PageKind& kind) { return kind.blocks.empty(); });
     return kinds;
 }

@@ -176,10 +176,11 @@ std::string ModelOf(const Content& content)
     AppendColumn(json, "langname", content,
                  [&](const PageBlock& b) { AppendJsonText(json, b.parameter->langname); });
     SharedTexts texts;
-    for (const auto& column : kSharedColumns)
+    for (const auto& column : kSharedColumns) {
         AppendColumn(json, column.key, content, [&](const PageBlock& b) {
             json += std::to_string(texts.IndexOf(column.textOf(*b.parameter)));
         });
+    }
     AppendColumn(json, "columns", content, [&](const PageBlock& b) {
         json += std::to_string(ShapeOf(*b.parameter).columns);
     });
@@ -236,9 +237,10 @@ void AppendOther(std::string& json, const PageBlock& block)
     json += '{';
     if (own.langname != other.langname)
         AppendText(json, "langname", other.langname);
-    for (const auto& column : kSharedColumns)
+    for (const auto& column : kSharedColumns) {
         if (column.textOf(own) != column.textOf(other))
             AppendText(json, column.key, column.textOf(other));
+    }
     const bool isDistribution = own.kind == Kind::kStuetzstellenverteilung;
     const Difference& difference = *block.difference;
     if (!difference.values.empty() || (isDistribution && !difference.x.empty()))
