@@ -90,6 +90,7 @@ void Texts()
     Take((longer <=> text) == (longer <=> L"") && (longer <=> L'_') == (longer <=> constant));
 
     Take(&dcm::SetThreadCodePage);
+    Take(&dcm::ThreadCodePage);
     Take(&dcm::ToUtf8);
     Take(&dcm::FromUtf8);
 }
