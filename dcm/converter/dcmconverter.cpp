@@ -144,7 +144,7 @@ void dcm::DocumentIo::Read(DCMConverter& document, FileBlock& block, ImportRepor
         throw;
     }
     if (keep && lines.Stored() != nullptr) {
-        report->Keep(*lines.Stored(), lines.Kind(), lines.FirstLine(), lines.VariantLine(),
+        report->Keep(*lines.Stored(), lines.Kind(), lines.FirstLine(), lines.VariantLines(),
                      lines.HasReferenceX() || lines.HasReferenceY());
     }
 }

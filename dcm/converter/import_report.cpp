@@ -73,15 +73,17 @@ void ImportReport::BeginText(const FileText& text, std::int32_t number) noexcept
 }
 
 void ImportReport::Keep(const DCMBaseType& stored, std::size_t kind, std::int64_t line,
-                        std::int64_t variantLine, bool references) noexcept
+                        const std::vector<std::int32_t>& variantLines, bool references) noexcept
 {
     try {
         const std::size_t hash = std::hash<std::wstring_view>()(stored.GetName()) + kind;
         if (!m_kept)
             m_kept.emplace();
-        m_kept->push_back({hash, &stored, static_cast<std::int32_t>(line),
-                           static_cast<std::int32_t>(variantLine), static_cast<unsigned char>(kind),
-                           references});
+        const auto firstVariant = static_cast<std::uint32_t>(m_variantLines.size());
+        m_variantLines.insert(m_variantLines.end(), variantLines.begin(), variantLines.end());
+        m_kept->push_back({hash, &stored, static_cast<std::int32_t>(line), firstVariant,
+                           static_cast<std::uint32_t>(variantLines.size()),
+                           static_cast<unsigned char>(kind), references});
     } catch (...) {
         m_findings.Miss();
     }
@@ -135,9 +137,9 @@ void ImportReport::CompareNames()
         const bool repeats = end - group > 1;
         for (auto kept = group; kept != end; ++kept) {
             // Names of equal hashes are equal, but for an accident that only tells too much.
-            if (kept->variantLine != 0) {
+            for (std::uint32_t i = 0; i < kept->variants; ++i) {
                 Add(FindingKind::kVariantLine, repeats ? Severity::kWarning : Severity::kNote,
-                    kept->variantLine, LabelOf(*kept->block, kept->kind),
+                    m_variantLines[kept->firstVariant + i], LabelOf(*kept->block, kept->kind),
                     {L"What tells variants of the parameter apart is not kept."});
             }
             if (kept != group && kept->block->GetName() == group->block->GetName()) {

@@ -35,7 +35,7 @@ public:
     void BeginText(const FileText& text, std::int32_t number) noexcept;
     /// Takes note of a block that was read and stored. `stored` must stay valid until the end.
     void Keep(const DCMBaseType& stored, std::size_t kind, std::int64_t line,
-              std::int64_t variantLine, bool references) noexcept;
+              const std::vector<std::int32_t>& variantLines, bool references) noexcept;
     /// What is left after the last empty line; the last line need not have a line end.
     void Unfinished(const FileBlock& block, bool lineEnds) noexcept;
     /// Compares the names of all blocks that were kept, and their axes with the distributions of
@@ -55,7 +55,9 @@ private:
         std::size_t hash;
         const DCMBaseType* block;
         std::int32_t line;
-        std::int32_t variantLine;
+        /// Which of m_variantLines are the block's.
+        std::uint32_t firstVariant;
+        std::uint32_t variants;
         unsigned char kind;
         bool references;
     };
@@ -72,6 +74,8 @@ private:
     BlockReport m_block;
     /// Made with the first block, since an empty one takes memory too.
     std::optional<std::deque<Kept>> m_kept;
+    /// The VAR lines of all of them.
+    std::vector<std::int32_t> m_variantLines;
     std::unordered_map<std::wstring_view, const DCMStuetzstellenverteilung*> m_distributions;
     /// Whether bytes were met that are no UTF-8, and the line of the first that may be.
     bool m_notUtf8 = false;

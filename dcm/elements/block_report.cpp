@@ -125,7 +125,7 @@ void BlockReport::Start(const FileBlock& block)
     m_slotsUsed = 0;
     m_end = m_textAfterEnd = false;
     m_referenceX = m_referenceY = false;
-    m_variantLine = 0;
+    m_variantLines.clear();
     m_noName = false;
     m_rows = {};
 }
@@ -365,7 +365,7 @@ void BlockReport::UnknownLine()
     const std::string_view line = TrimWhite(Line(m_index));
     const bool bare = Meant(m_rest).empty();
     if (EqualsNoCase(m_keyword, kVariant)) {
-        m_variantLine = m_variantLine != 0 ? m_variantLine : m_line;
+        NoteVariantLine();
         return;
     }
     if (IsOneOf(m_keyword, kLineKeywords)) {
@@ -377,6 +377,16 @@ void BlockReport::UnknownLine()
         return DroppedComment(line);
     }
     Add(FindingKind::kUnknownLine, {L"The line ", Quote(line), L" is not read in such a block."});
+}
+
+/// Notes the line; whether it is told as a warning is known at the end of the file.
+void BlockReport::NoteVariantLine()
+{
+    try {
+        m_variantLines.push_back(static_cast<std::int32_t>(m_line));
+    } catch (...) {
+        m_findings.Miss();
+    }
 }
 
 void BlockReport::Rejected()

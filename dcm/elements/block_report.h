@@ -9,6 +9,7 @@
 #include <cstdint>
 #include <initializer_list>
 #include <string_view>
+#include <vector>
 
 class DCMBaseType;
 
@@ -155,7 +156,8 @@ public:
     const RowCheck& Rows() const { return m_rows; }
     std::int64_t FirstLine() const { return m_firstLine; }
     std::int64_t Line() const { return m_line; }
-    std::int64_t VariantLine() const { return m_variantLine; }
+    /// The VAR lines of the block.
+    const std::vector<std::int32_t>& VariantLines() const { return m_variantLines; }
     bool HasReferenceX() const { return m_referenceX; }
     bool HasReferenceY() const { return m_referenceY; }
     const CString& Label() noexcept;
@@ -180,6 +182,7 @@ private:
     void AfterEnd();
     void CheckName(std::string_view kept, std::string_view meant, const wchar_t* none);
     void SingleValue();
+    void NoteVariantLine();
     void Repeated(std::string_view keyword, std::string_view content, bool empty);
     bool TakeText(std::string_view& text);
     void EmptyTextDropped();
@@ -204,7 +207,7 @@ private:
     bool m_textAfterEnd = false;
     bool m_referenceX = false;
     bool m_referenceY = false;
-    std::int64_t m_variantLine = 0;
+    std::vector<std::int32_t> m_variantLines;
     RowCheck m_rows;
     const DCMBaseType* m_stored = nullptr;
     std::size_t m_kind = 0;

@@ -354,7 +354,7 @@ public:
                                      L" blocks, or as one of another kind."});
             }
             comparer.Compare(wrote, read.front());
-            m_report.Keep(block, static_cast<std::size_t>(wrote.kind), line, 0, false);
+            m_report.Keep(block, static_cast<std::size_t>(wrote.kind), line, {}, false);
         });
     }
 
