@@ -10,13 +10,21 @@
 #include "tools/trouble.h"
 
 #include <algorithm>
-#include <array>
+#include <iterator>
 #include <string>
+#include <string_view>
 #include <utility>
+#include <vector>
 
 namespace dcm::tools {
 
 namespace {
+
+/// Findings that a file has as a whole, and that what is written from it has again.
+constexpr std::pair<std::string_view, Severity> kOfTheWholeFile[] = {
+    {"duplicate-name", Severity::kNote},
+    {"looks-like-utf-8", Severity::kWarning},
+};
 
 /// The reports of a file.
 struct Checked
@@ -25,12 +33,31 @@ struct Checked
     Report ofImport;
     Report ofExport;
 
-    std::array<const Report*, 2> Reports() const { return {&ofImport, &ofExport}; }
     std::size_t Count(Severity severity) const
     {
-        return ofImport.Count(severity) + ofExport.Count(severity);
+        std::size_t count = ofImport.Count(severity) + ofExport.Count(severity);
+        for (const auto& [id, itsSeverity] : kOfTheWholeFile)
+            count -= itsSeverity == severity && IsTold(id) ? ofExport.Count(id) : 0;
+        return count;
+    }
+    /// The findings of the import, or those of the export without what the import has told.
+    std::vector<Finding> FindingsOf(const Report& report) const
+    {
+        std::vector<Finding> findings = report.Findings();
+        if (&report == &ofExport)
+            std::erase_if(findings, [&](const Finding& finding) { return IsTold(finding.id); });
+        return findings;
     }
     bool Incomplete() const { return ofImport.Incomplete() || ofExport.Incomplete(); }
+
+private:
+    /// Whether a finding of the export with this id says again what the import has told.
+    bool IsTold(std::string_view id) const
+    {
+        return std::any_of(std::begin(kOfTheWholeFile), std::end(kOfTheWholeFile),
+                           [&](const auto& known) { return known.first == id; }) &&
+               ofImport.Count(id) >= ofExport.Count(id);
+    }
 };
 
 Checked CheckFile(const std::string& argument, const CheckOptions& options, Progress& progress)
@@ -44,8 +71,8 @@ Checked CheckFile(const std::string& argument, const CheckOptions& options, Prog
 
 void PrintText(const Checked& checked)
 {
-    for (const Report* report : checked.Reports()) {
-        for (const Finding& finding : report->Findings())
+    for (const Report* report : {&checked.ofImport, &checked.ofExport}) {
+        for (const Finding& finding : checked.FindingsOf(*report))
             Print(FindingText(checked.label, finding, Painted) + '\n');
     }
     if (checked.Incomplete()) {
@@ -56,10 +83,10 @@ void PrintText(const Checked& checked)
     }
 }
 
-Json JsonOfFindings(const Report& report)
+Json JsonOfFindings(const std::vector<Finding>& list)
 {
     Json findings = Json::array();
-    for (const Finding& finding : report.Findings()) {
+    for (const Finding& finding : list) {
         findings.push_back({{"severity", ToUtf8(NameOf(finding.severity))},
                             {"id", finding.id},
                             {"line", finding.line},
@@ -76,8 +103,8 @@ Json JsonOf(const Checked& checked)
             {"warnings", checked.Count(Severity::kWarning)},
             {"notes", checked.Count(Severity::kNote)},
             {"incomplete", checked.Incomplete()},
-            {"import", JsonOfFindings(checked.ofImport)},
-            {"export", JsonOfFindings(checked.ofExport)}};
+            {"import", JsonOfFindings(checked.FindingsOf(checked.ofImport))},
+            {"export", JsonOfFindings(checked.FindingsOf(checked.ofExport))}};
 }
 
 /// Whether a file has findings from a severity on.
