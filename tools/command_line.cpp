@@ -41,6 +41,7 @@ template <class Map>
 std::vector<std::string> NamesOf(const Map& map)
 {
     std::vector<std::string> names;
+    names.reserve(map.size());
     for (const auto& [name, value] : map)
         names.push_back(name);
     return names;

@@ -253,7 +253,7 @@ Json JsonOfDifference(const Difference& difference, const Sides& sides)
 void PrintJson(std::span<const Difference> differences, const Sides& sides,
                const DiffOptions& options)
 {
-    Print("{\"format\": \"dcm-diff\", \"version\": 1, \"old\": " + JsonText(options.oldFile) +
+    Print(R"({"format": "dcm-diff", "version": 1, "old": )" + JsonText(options.oldFile) +
           ", \"new\": " + JsonText(options.newFile));
     for (const ChangeWord& word : kChangeWords) {
         Print(", \"" + std::string(word.word) +

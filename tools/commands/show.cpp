@@ -180,7 +180,7 @@ std::string LinesText(const Parameter& parameter)
     const std::string title = TitleOf(parameter);
     std::string text;
     for (const auto& [keyword, attribute] : AttributesOf(parameter))
-        text += title + ": " + keyword + " = " + attribute + '\n';
+        text.append(title).append(": ").append(keyword).append(" = ").append(attribute) += '\n';
     const bool isDistribution = parameter.kind == Kind::kStuetzstellenverteilung;
     const auto& values = isDistribution ? parameter.x.points : parameter.values;
     for (std::size_t i = 0; i < values.size(); ++i) {
