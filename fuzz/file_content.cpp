@@ -52,15 +52,15 @@ Item NumberItem(const std::string& token)
     return {true, std::bit_cast<std::uint64_t>(value), {}};
 }
 
-/// The quoted texts of a line: each begins after a quote and ends before the next one that a blank
-/// or the end of the line follows.
-std::vector<Item> TextItems(std::string_view rest)
+/// The quoted texts of a line: each begins after a quote and ends before the next one. In a value
+/// block, where quotes may be inside, a blank or the end of the line follows that.
+std::vector<Item> TextItems(std::string_view rest, bool quotesInside)
 {
     std::vector<Item> items;
     while (!(rest = Strip(rest, kWhite)).empty()) {
         rest.remove_prefix(1);
         std::size_t end = rest.find('"');
-        while (end < rest.size() && end + 1 < rest.size() &&
+        while (quotesInside && end < rest.size() && end + 1 < rest.size() &&
                kWhite.find(rest[end + 1]) == kWhite.npos)
             end = rest.find('"', end + 1);
         items.push_back({false, 0, std::string(rest.substr(0, end))});
@@ -70,11 +70,11 @@ std::vector<Item> TextItems(std::string_view rest)
 }
 
 /// The items of a line: texts when it begins with a quote, otherwise numbers.
-void AppendItems(std::vector<Item>& items, std::string_view rest)
+void AppendItems(std::vector<Item>& items, std::string_view rest, bool quotesInside = false)
 {
     rest = Strip(rest, kWhite);
     if (rest.starts_with('"')) {
-        const auto texts = TextItems(rest);
+        const auto texts = TextItems(rest, quotesInside);
         items.insert(items.end(), texts.begin(), texts.end());
         return;
     }
@@ -132,7 +132,7 @@ void AddLine(Content& block, const std::string& keyword, std::string_view rest)
         if (single)
             SetSingleValue(block, keyword, rest);
         else
-            AppendItems(block.values, rest);
+            AppendItems(block.values, rest, block.head[0] == "FESTWERTEBLOCK");
     }
 }
 
