@@ -145,6 +145,9 @@ std::vector<std::string> HeadOf(const std::string& keyword, std::string_view res
     // Counts are decimal numbers, in whatever form.
     for (std::size_t i = 1; i < head.size(); ++i)
         head[i] = head[i] == "@" ? head[i] : std::to_string(std::atoi(head[i].c_str()));
+    // No rows of nothing are no values, like the count 0.
+    if (head.size() == 4 && head[1] == "0" && head[2] == "@" && head[3] == "0")
+        head.resize(2);
     head.insert(head.begin(), keyword);
     return head;
 }
