@@ -28,10 +28,11 @@ public:
         }
         if (!parameter.values.empty())
             return;
+        const CComVariant none;
         for (const CComVariant& point : parameter.x.points)
-            AddRow(parameter, point, {}, {});
+            AddRow(parameter, point, none, none);
         if (parameter.x.points.empty())
-            AddRow(parameter, {}, {}, {});
+            AddRow(parameter, none, none, none);
     }
 
     /// Adds a cell and, after the last one of a row, its end.
