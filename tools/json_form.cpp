@@ -39,9 +39,8 @@ std::vector<std::uint32_t> CharactersOf(std::wstring_view text)
     for (const wchar_t character : text) {
         const auto number =
             static_cast<std::uint32_t>(static_cast<std::make_unsigned_t<wchar_t>>(character));
-        const bool low = number >= kFirstLow && number < kAfterLow;
-        if (kHasPairs && low && !characters.empty() && characters.back() >= kFirstHigh &&
-            characters.back() < kFirstLow) {
+        if (kHasPairs && number >= kFirstLow && number < kAfterLow && !characters.empty() &&
+            characters.back() >= kFirstHigh && characters.back() < kFirstLow) {
             characters.back() =
                 kFirstBeyondBmp + ((characters.back() - kFirstHigh) << 10U) + (number - kFirstLow);
         } else {
@@ -258,9 +257,9 @@ void RequireFormat(const Place& document)
 {
     RequireMembers(document, {"format", "version", "comment", "parameters"});
     if (!document.Has("format") || document.json.at("format") != kFormat)
-        document.Expect("\"format\": \"" + std::string(kFormat) + "\"");
+        document.Expect(R"("format": ")" + std::string(kFormat) + '"');
     if (!document.Has("version") || document.json.at("version") != kVersion)
-        document.Expect("\"version\": " + std::to_string(kVersion));
+        document.Expect(R"("version": )" + std::to_string(kVersion));
     if (!document.Has("parameters") || !document.json.at("parameters").is_array())
         document.Expect("an array \"parameters\"");
 }
@@ -369,9 +368,9 @@ std::string JsonText(const Json& json)
 
 std::string JsonText(const CString& comment, std::span<const Parameter> parameters)
 {
-    std::string text = "{\"format\": \"" + std::string(kFormat) +
-                       "\", \"version\": " + std::to_string(kVersion) +
-                       ",\n\"comment\": " + JsonText(JsonOf(comment)) + ",\n\"parameters\": [";
+    std::string text = R"({"format": ")" + std::string(kFormat) + R"(", "version": )" +
+                       std::to_string(kVersion) + ",\n\"comment\": " + JsonText(JsonOf(comment)) +
+                       ",\n\"parameters\": [";
     const char* separator = "\n";
     for (const Parameter& parameter : parameters) {
         text += separator + JsonText(JsonOf(parameter));

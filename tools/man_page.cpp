@@ -28,7 +28,7 @@ std::string Escaped(std::string_view text)
 /// Whether an option is named by its place.
 bool IsPositional(const CLI::Option& option)
 {
-    return option.nonpositional() == false;
+    return !option.nonpositional();
 }
 
 std::string OptionTitle(const CLI::Option& option)
@@ -44,7 +44,7 @@ std::string OptionTitle(const CLI::Option& option)
 /// The arguments that a command cannot do without, and a word for the others.
 std::string Synopsis(const CLI::App& command)
 {
-    std::string line = "\\fBdcm " + Escaped(command.get_name()) + "\\fR [\\fIOPTIONS\\fR]";
+    std::string line = "\\fBdcm " + Escaped(command.get_name()) + R"(\fR [\fIOPTIONS\fR])";
     for (const CLI::Option* option : command.get_options()) {
         if (option->get_required() && !IsPositional(*option)) {
             line += " \\fB\\-" + option->get_snames().front() + "\\fR \\fI" +
@@ -78,7 +78,7 @@ std::string CommandText(const CLI::App& command)
 
 std::string ManPage(const CLI::App& app)
 {
-    std::string page = ".TH DCM 1 \"\" \"dcm " + std::string(LibraryVersion()) +
+    std::string page = R"(.TH DCM 1 "" "dcm )" + std::string(LibraryVersion()) +
                        "\" \"User Commands\"\n"
                        ".SH NAME\ndcm \\- look at, check, compare, merge and convert calibration "
                        "data files\n"

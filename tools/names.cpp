@@ -63,6 +63,7 @@ std::vector<CString> NearestNames(std::wstring_view mistyped, std::span<const Pa
             nearest.erase(std::prev(nearest.end()));
     }
     std::vector<CString> names;
+    names.reserve(nearest.size());
     for (const auto& [distance, name] : nearest)
         names.push_back(name);
     return names;

@@ -83,7 +83,7 @@ public:
     /// A line with a keyword and a blank, which a reader looks at next.
     void KeywordLine(std::size_t index, std::string_view keyword, std::string_view rest);
     /// A line without a blank, which no reader sees.
-    void OtherLine(std::size_t index, std::string_view line);
+    void OtherLine(std::size_t index, std::string_view bytes);
     /// No line is left.
     void End();
 
@@ -177,7 +177,7 @@ private:
     void LookForKinds(std::size_t index);
     bool LookForKind(std::size_t index);
     bool LookForKind(std::size_t index, std::string_view keyword);
-    bool TabFollows(std::string_view line);
+    bool TabFollows(std::string_view bytes);
     void LookAtCharacters(std::string_view line);
     void AfterEnd();
     void CheckName(std::string_view kept, std::string_view meant, const wchar_t* none);

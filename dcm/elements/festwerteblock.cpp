@@ -85,7 +85,7 @@ void ReadTexts(std::string_view rest, const dcm::FileText& text, dcm::BlockRepor
             const std::size_t end = FindClosingQuote(rest);
             if (end == rest.npos) {
                 // No quote closes the text: it runs to the end, without a final quote.
-                add(rest.substr(0, rest.size() - rest.ends_with('"')));
+                add(rest.substr(0, rest.size() - (rest.ends_with('"') ? 1 : 0)));
                 break;
             }
             add(rest.substr(0, end));
@@ -205,9 +205,10 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwerteblock& block)
             reader.UnknownLine();
         }
     }
-    if (report != nullptr)
+    if (report != nullptr) {
         ReportValues(*report, declared, block, block.m_vecDoubleValues.size(),
                      block.m_listStringValues.size());
+    }
     return S_OK;
 }
 

@@ -287,7 +287,8 @@ double ReadKnownToken(const char* at, const char* end)
 char* WriteNumber(double value, int digits, char* to) noexcept
 {
     const auto bits = std::bit_cast<std::uint64_t>(value);
-    std::memcpy(to, " -", 2);
+    to[0] = ' ';
+    to[1] = '-';
     to += 1 + (bits >> 63);
     const auto magnitude = bits & ~kSignBit;
     Decimal decimal;

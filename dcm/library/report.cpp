@@ -281,7 +281,8 @@ HRESULT Save(const DCMConverter& document, const CString& path, Report& report)
 
 CString NullDevice()
 {
-    return CString(system::kNullDevice);
+    CString path(system::kNullDevice);
+    return path;
 }
 
 } // namespace dcm

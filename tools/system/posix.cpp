@@ -121,7 +121,7 @@ InputCopy::InputCopy()
     }
 }
 
-void InputCopy::Copy()
+void InputCopy::Copy() const
 {
     std::array<char, 65536> buffer;
     for (;;) {

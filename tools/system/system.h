@@ -40,7 +40,7 @@ public:
     const std::string& Path() const { return m_path; }
 
 private:
-    void Copy();
+    void Copy() const;
 
     std::string m_path;
     int m_file = -1;

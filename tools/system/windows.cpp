@@ -173,7 +173,7 @@ InputCopy::InputCopy()
     }
 }
 
-void InputCopy::Copy()
+void InputCopy::Copy() const
 {
     const Handle file(CreateFileW(Wide(m_path).c_str(), GENERIC_WRITE, FILE_SHARE_DELETE, nullptr,
                                   CREATE_ALWAYS, FILE_ATTRIBUTE_TEMPORARY, nullptr));

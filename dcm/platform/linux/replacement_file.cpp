@@ -10,6 +10,7 @@
 #include <string>
 #include <sys/stat.h>
 #include <unistd.h>
+#include <utility>
 
 namespace dcm::system {
 
@@ -33,7 +34,9 @@ long FollowLinks(std::string& path)
         if (size < 0) // EINVAL: not a link.
             return errno == EINVAL || errno == ENOENT ? 0 : errno;
         next.resize(static_cast<std::size_t>(size));
-        path = next.starts_with('/') ? next : FolderOf(path) + next;
+        if (!next.starts_with('/'))
+            next.insert(0, FolderOf(path));
+        path = std::move(next);
     }
     return ELOOP;
 }
