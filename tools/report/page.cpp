@@ -30,10 +30,11 @@ std::string Html(std::wstring_view text)
     std::string html;
     for (const char c : dcm::ToUtf8(text)) {
         const std::size_t special = kSpecial.find(c);
-        if (special == kSpecial.npos)
+        if (special == kSpecial.npos) {
             html += c;
-        else
+        } else {
             html += kEntities[special];
+        }
     }
     return html;
 }
@@ -88,11 +89,12 @@ void AppendColumn(std::string& json, std::string_view key, const Content& conten
 {
     AppendKey(json, key);
     json += '[';
-    for (const PageKind& kind : content.kinds)
+    for (const PageKind& kind : content.kinds) {
         for (const PageBlock& block : kind.blocks) {
             append(block);
             json += ',';
         }
+    }
     AppendEnd(json, ']');
     json += ",\n";
 }
@@ -134,7 +136,7 @@ void AppendKinds(std::string& json, const Content& content)
 void AppendFindings(std::string& json, const PageFile& file)
 {
     json += '[';
-    if (file.report != nullptr)
+    if (file.report != nullptr) {
         for (const Finding& finding : file.report->Findings()) {
             json += '[' + std::to_string(static_cast<int>(finding.severity)) + ',' +
                     std::to_string(finding.line) + ',';
@@ -145,6 +147,7 @@ void AppendFindings(std::string& json, const PageFile& file)
             json += finding.id;
             json += R"("],)";
         }
+    }
     AppendEnd(json, ']');
 }
 
@@ -287,7 +290,7 @@ void WriteValues(std::ostream& out, const Content& content)
         json.clear();
         first = next;
     };
-    for (const PageKind& kind : content.kinds)
+    for (const PageKind& kind : content.kinds) {
         for (const PageBlock& block : kind.blocks) {
             AppendBlock(json, block);
             json += ",";
@@ -295,6 +298,7 @@ void WriteValues(std::ostream& out, const Content& content)
             if (json.size() >= kPiece)
                 write();
         }
+    }
     write();
 }
 
@@ -314,9 +318,10 @@ void WriteList(std::ostream& out, const Content& content)
            "off. These are their names.</p>\n";
     for (const PageKind& kind : content.kinds) {
         out << "<h2>" << Html(KeywordOf(kind.kind)) << "</h2><ul>\n";
-        for (const PageBlock& block : kind.blocks)
+        for (const PageBlock& block : kind.blocks) {
             out << "<li>" << Html(block.parameter->name) << " <small>"
                 << Html(block.parameter->langname) << "</small>\n";
+        }
         out << "</ul>\n";
     }
     out << "</noscript>\n";
