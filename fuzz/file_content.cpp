@@ -97,10 +97,11 @@ void SetSingleValue(Content& block, const std::string& keyword, std::string_view
     if (keyword == "WERT" && rest.empty())
         return;
     block.values.clear();
-    if (keyword == "WERT")
+    if (keyword == "WERT") {
         block.values.push_back(NumberItem(std::string(rest)));
-    else
+    } else {
         block.values.push_back({false, 0, std::string(Strip(rest, "\""))});
+    }
 }
 
 /// Whether a line of points says nothing to a kind that has no such axis: an empty text equals
@@ -129,10 +130,11 @@ void AddLine(Content& block, const std::string& keyword, std::string_view rest)
         AppendItems(block.y, rest);
         block.rows.resize(block.y.size(), block.values.size());
     } else if (keyword == "WERT" || keyword == "TEXT") {
-        if (single)
+        if (single) {
             SetSingleValue(block, keyword, rest);
-        else
+        } else {
             AppendItems(block.values, rest, block.head[0] == "FESTWERTEBLOCK");
+        }
     }
 }
 

@@ -123,9 +123,10 @@ private:
     {
         while (count > 0) {
             std::string line = text ? texts : numbers;
-            for (std::size_t left = std::min(count, 1 + Below(6)); left > 0; --left, --count)
+            for (std::size_t left = std::min(count, 1 + Below(6)); left > 0; --left, --count) {
                 line += (Below(3) == 0 ? "   " : " ") +
                         (text ? '"' + Any(kWords) + '"' : Any(kNumbers));
+            }
             Line(line);
         }
     }
@@ -137,10 +138,11 @@ private:
         const bool textstring = Below(3) == 0;
         FirstLine((textstring ? "TEXTSTRING " : "FESTWERT ") + Name());
         Attributes("W");
-        if (textstring || Below(4) == 0)
+        if (textstring || Below(4) == 0) {
             Line("TEXT \"" + Any(kWords) + '"');
-        else
+        } else {
             Line("WERT " + Any(kNumbers));
+        }
     }
 
     void ValueBlock()
@@ -235,10 +237,11 @@ void ChangeALine(std::string& file, Random& random)
 {
     std::vector<std::string> lines(1);
     for (const char c : file) {
-        if (c == '\n')
+        if (c == '\n') {
             lines.emplace_back();
-        else
+        } else {
             lines.back() += c;
+        }
     }
     const auto below = [&](std::size_t limit) { return random() % limit; };
     const std::size_t at = below(lines.size());

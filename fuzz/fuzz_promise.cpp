@@ -23,9 +23,10 @@ bool IsClean(const dcm::Report& report)
 void Print(const char* what, const dcm::Report& report)
 {
     std::fprintf(stderr, "%s: %s\n", what, dcm::ToUtf8(report.Summary()).c_str());
-    for (const dcm::Finding& finding : report.Findings())
+    for (const dcm::Finding& finding : report.Findings()) {
         std::fprintf(stderr, "  %lld: %s [%s]\n", static_cast<long long>(finding.line),
                      dcm::ToUtf8(finding.message).c_str(), std::string(finding.id).c_str());
+    }
 }
 
 /// Findings are in the order of their lines, and within the bounds that are promised.
