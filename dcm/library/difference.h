@@ -59,6 +59,7 @@ DCM_API std::wstring_view KeywordOf(Field field) noexcept;
 /// A field with another content.
 struct FieldDifference
 {
+    /// Which field it is.
     Field field;
     /// Counts are decimal numbers here.
     CString oldText;
@@ -94,7 +95,9 @@ enum class Change
 /// One parameter that is not the same in both lists.
 struct Difference
 {
+    /// What kind of difference it is.
     Change change = Change::kChanged;
+    /// Kind and name of the parameter, the same on both sides.
     Kind kind = Kind::kFestwert;
     CString name;
     /// Where the parameter is in the two lists; `kNoIndex` where it is not.

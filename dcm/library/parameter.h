@@ -68,7 +68,9 @@ struct Axis
 /// One named block of any kind. It owns all that it holds and is not tied to a document.
 struct Parameter
 {
+    /// The kind of the block.
     Kind kind = Kind::kFestwert;
+    /// The name, and the texts of LANGNAME, DISPLAYNAME and FUNKTION; empty for none.
     CString name;
     CString langname;
     CString displayname;
@@ -137,11 +139,13 @@ DCM_API CString HeaderOfComment(const CString& comment);
 class DCM_API BlockVisitor
 {
 public:
+    /// A visitor has no content of its own.
     BlockVisitor() = default;
     BlockVisitor(const BlockVisitor&) = default;
     BlockVisitor& operator=(const BlockVisitor&) = default;
     virtual ~BlockVisitor();
 
+    /// One block of the class.
     virtual void Visit(const DCMFestwert& block);
     virtual void Visit(const DCMFestwerteblock& block);
     virtual void Visit(const DCMStuetzstellenverteilung& block);

@@ -21,6 +21,7 @@ enum class Severity : unsigned char
 /// One thing that an import or export met.
 struct Finding
 {
+    /// How much it matters.
     Severity severity;
     /// What kind of finding it is, such as "unfinished-block"; the same in all later versions. The
     /// text is never released. docs/findings.md tells of each.

@@ -19,6 +19,7 @@ using DATE = double;
 /// An amount of money in units of 1/10000.
 struct CY
 {
+    /// The amount times 10000.
     std::int64_t int64;
 };
 
