@@ -2,6 +2,11 @@
 # Functions that the scripts share. They source this file right after `set -euo pipefail`.
 
 cd "$(dirname "${BASH_SOURCE[0]}")/.." || exit
+# Where ccache is installed, what was compiled before is not compiled again, in whichever folder.
+if command -v ccache >/dev/null; then
+    export CMAKE_C_COMPILER_LAUNCHER=ccache CMAKE_CXX_COMPILER_LAUNCHER=ccache
+    export CCACHE_BASEDIR=$PWD CCACHE_NOHASHDIR=1
+fi
 export CMAKE_BUILD_PARALLEL_LEVEL=${CMAKE_BUILD_PARALLEL_LEVEL:-$(nproc)}
 
 # Runs a command and prints its output only if it fails.
