@@ -254,8 +254,8 @@ char* PutUtf8(std::uint32_t c, char* to)
     const std::uint64_t number = c;
     const unsigned mark = 0xFFU & ~(0x7FU >> more);
     *to++ = static_cast<char>(mark | number >> (6 * more));
-    while (more-- > 0)
-        *to++ = static_cast<char>(0x80 | (number >> (6 * more) & 0x3F));
+    for (; more > 0; --more)
+        *to++ = static_cast<char>(0x80 | (number >> (6 * (more - 1)) & 0x3F));
     return to;
 }
 
