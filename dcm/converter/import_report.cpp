@@ -5,8 +5,8 @@
 #include "dcm/elements/kennfeld.h"
 #include "dcm/elements/kennlinie.h"
 #include "dcm/elements/stuetzstellenverteilung.h"
+#include "dcm/platform/encoding.h"
 #include "dcm/platform/text.h"
-#include "dcm/textfile/utf8_look.h"
 
 #include <algorithm>
 #include <functional>

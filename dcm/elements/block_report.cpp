@@ -2,8 +2,8 @@
 
 #include "dcm/elements/keywords.h"
 #include "dcm/elements/number.h"
+#include "dcm/platform/encoding.h"
 #include "dcm/platform/text.h"
-#include "dcm/textfile/utf8_look.h"
 
 #include <algorithm>
 #include <charconv>

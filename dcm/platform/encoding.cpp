@@ -359,4 +359,21 @@ std::string_view WithoutFirstCharacter(std::string_view bytes, Encoding encoding
     return bytes;
 }
 
+Utf8Look LookAsUtf8(std::string_view bytes)
+{
+    constexpr std::string_view replacement = "\xEF\xBF\xBD";
+    Utf8Look look;
+    for (std::string_view rest = bytes;;) {
+        rest.remove_prefix(AsciiLength(rest));
+        if (rest.empty())
+            return look;
+        const std::size_t at = bytes.size() - rest.size();
+        if (TakeUtf8(rest) == kReplacement && !bytes.substr(at).starts_with(replacement)) {
+            look.firstBad = at;
+            return look;
+        }
+        look.firstWide = std::min(look.firstWide, at);
+    }
+}
+
 } // namespace dcm

@@ -2,7 +2,6 @@
 
 #include "dcm/platform/exception.h"
 #include "dcm/platform/thread_code_page.h"
-#include "dcm/textfile/utf8_look.h"
 
 #include <algorithm>
 #include <limits>
