@@ -95,6 +95,9 @@ std::vector<ExportCase> ExportCases()
         {"trimmed", value(L" a"),
          "5 warning text-trimmed FESTWERT A\n7 warning text-trimmed FESTWERT A\n"},
         {"page", value(L"\x4E2D"), "5 error not-in-code-page FESTWERT A\n"},
+        // With 16 bits the first is a pair of wide characters, of which the file has one.
+        {"pair and half", value(CString(L"\U0001F600") + L"\xDE00"),
+         "5 error not-in-code-page FESTWERT A\n"},
         {"tab in a point", text(L"a\tb"), "5 error character-replaced STUETZSTELLENVERTEILUNG A\n"},
         {"quote in a point", text(L"a\"b"),
          "5 warning count-differs STUETZSTELLENVERTEILUNG A\n"

@@ -4,6 +4,7 @@
 #include "dcm/converter/import_report.h"
 #include "dcm/elements/block_io.h"
 #include "dcm/library/parameter.h"
+#include "dcm/platform/encoding.h"
 #include "dcm/platform/text.h"
 #include "dcm/textfile/file_text.h"
 #include "dcm/textfile/file_text_builder.h"
@@ -73,6 +74,37 @@ std::wstring_view Trimmed(std::wstring_view text)
     while (!text.empty() && IsTrimmed(text.back()))
         text.remove_suffix(1);
     return text;
+}
+
+/// What became of the characters of a text.
+struct Fate
+{
+    /// Some were written as a full stop or a question mark, as a file cannot hold them.
+    bool replaced = false;
+    /// The code page lacks some.
+    bool lacking = false;
+    /// Others came back, or more or fewer.
+    bool altered = false;
+};
+
+Fate FateOf(std::wstring_view wrote, std::wstring_view read)
+{
+    constexpr std::u32string_view stops = U"\n\r\t\b";
+    Fate fate;
+    while (!wrote.empty() && !read.empty()) {
+        const char32_t from = TakeCharacter(wrote), to = TakeCharacter(read);
+        if (from == to)
+            continue;
+        if ((to == U'.' && stops.find(from) != stops.npos) || (to == U'?' && from == U'\0')) {
+            fate.replaced = true;
+        } else if (to == U'?' || to == 0xFFFD) {
+            fate.lacking = true;
+        } else {
+            fate.altered = true;
+        }
+    }
+    fate.altered = fate.altered || wrote.empty() != read.empty();
+    return fate;
 }
 
 std::wstring_view TextOf(const CComVariant& value)
@@ -161,27 +193,17 @@ private:
         // A unit of one blank asks for a line with an empty unit.
         if (wrote == read || (role == TextRole::kAttribute && wrote == L" " && read.empty()))
             return;
-        bool replaced = false, lacking = false, same = wrote.size() == read.size();
-        for (std::size_t i = 0; same && i < wrote.size(); ++i) {
-            const wchar_t from = wrote[i], to = read[i];
-            const bool isReplaced = (to == L'.' && std::wstring_view(L"\n\r\t\b").find(from) !=
-                                                       std::wstring_view::npos) ||
-                                    (to == L'?' && from == L'\0');
-            const bool isLacking = !isReplaced && from != to && (to == L'?' || to == 0xFFFD);
-            replaced = replaced || isReplaced;
-            lacking = lacking || isLacking;
-            same = isReplaced || isLacking || from == to;
-        }
+        const Fate fate = FateOf(wrote, read);
         const auto quoted = [](std::wstring_view text) { return MessagePart::Quoted(text); };
-        if (same && replaced) {
+        if (!fate.altered && fate.replaced) {
             Add(FindingKind::kCharacterReplaced,
                 {L"Control characters in ", quoted(wrote), L" are written as other characters."});
         }
-        if (same && lacking) {
+        if (!fate.altered && fate.lacking) {
             Add(FindingKind::kNotInCodePage,
                 {L"Characters of ", quoted(wrote), L" are not in the code page and are lost."});
         }
-        if (same)
+        if (!fate.altered)
             return;
         const bool trimmed = Trimmed(wrote) == Trimmed(read);
         const bool note = trimmed && role == TextRole::kAttribute;

@@ -221,22 +221,12 @@ wchar_t* DecodeUtf8(std::string_view bytes, wchar_t* to, Take take)
     }
 }
 
-/// Takes one character off the start of `text`, which must not be empty. A surrogate without its
-/// other half, and a number that is no character, are U+FFFD.
+/// The same as `TakeCharacter`, but a surrogate without its other half, and a number that is no
+/// character, are U+FFFD.
 std::uint32_t TakeWide(std::wstring_view& text)
 {
-    const std::uint32_t c = Number(text[0]);
-    text.remove_prefix(1);
-    if (c < 0xD800 || (c > 0xDFFF && c <= 0x10FFFF))
-        return c;
-    if (sizeof(wchar_t) == 2 && c < 0xDC00 && !text.empty()) {
-        const std::uint32_t low = Number(text[0]);
-        if (low >= 0xDC00 && low <= 0xDFFF) {
-            text.remove_prefix(1);
-            return ((c - 0xD7C0) << 10) | (low - 0xDC00);
-        }
-    }
-    return kReplacement;
+    const std::uint32_t c = TakeCharacter(text);
+    return c < 0xD800 || (c > 0xDFFF && c <= 0x10FFFF) ? c : kReplacement;
 }
 
 /// Writes `c` in UTF-8, continued to numbers of 32 bits: a first byte with `n` leading ones is
@@ -298,6 +288,20 @@ char* PutLenientUtf8(std::uint32_t c, char* to)
 }
 
 } // namespace
+
+std::uint32_t TakeCharacter(std::wstring_view& text)
+{
+    const std::uint32_t c = Number(text[0]);
+    text.remove_prefix(1);
+    if (sizeof(wchar_t) == 2 && c >= 0xD800 && c < 0xDC00 && !text.empty()) {
+        const std::uint32_t low = Number(text[0]);
+        if (low >= 0xDC00 && low <= 0xDFFF) {
+            text.remove_prefix(1);
+            return ((c - 0xD7C0) << 10) | (low - 0xDC00);
+        }
+    }
+    return c;
+}
 
 char* Encode(std::wstring_view text, Encoding encoding, char* to)
 {

@@ -3,6 +3,7 @@
 #include "dcm/platform/cstring.h"
 
 #include <cstddef>
+#include <cstdint>
 #include <string_view>
 
 /// Conversion between bytes and wide characters. In each of these encodings a text can be cut at
@@ -41,6 +42,10 @@ char* Encode(std::wstring_view text, Encoding encoding, char* to);
 /// Appends the wide form of `bytes` to `text`. In UTF-8, bytes that are not a character become
 /// U+FFFD.
 void AppendDecoded(CString& text, std::string_view bytes, Encoding encoding);
+
+/// Takes one character off the start of `text`, which must not be empty: with wide characters of 16
+/// bits, a surrogate pair is one. A surrogate without its other half is its own number.
+std::uint32_t TakeCharacter(std::wstring_view& text);
 
 /// The wide form of `bytes`.
 CString Decode(std::string_view bytes, Encoding encoding);
