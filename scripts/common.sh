@@ -6,6 +6,8 @@ cd "$(dirname "${BASH_SOURCE[0]}")/.." || exit
 if command -v ccache >/dev/null; then
     export CMAKE_C_COMPILER_LAUNCHER=ccache CMAKE_CXX_COMPILER_LAUNCHER=ccache
     export CCACHE_BASEDIR=$PWD CCACHE_NOHASHDIR=1
+    # It reads no list of a sanitizer by itself.
+    export CCACHE_EXTRAFILES=$PWD/cmake/ubsan-ignore.txt
 fi
 export CMAKE_BUILD_PARALLEL_LEVEL=${CMAKE_BUILD_PARALLEL_LEVEL:-$(nproc)}
 

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <limits>
 #include <string>
 #include <utility>
 
@@ -132,9 +133,12 @@ void FindingList::List(FindingKind kind, Severity severity, std::int64_t line, c
 
 void FindingList::Sort() noexcept
 {
-    std::stable_sort(m_list.begin(), m_list.end(), [](const Finding& a, const Finding& b) {
-        return static_cast<std::uint64_t>(a.line) - 1 < static_cast<std::uint64_t>(b.line) - 1;
-    });
+    // Those that concern no line come last.
+    const auto place = [](const Finding& finding) {
+        return finding.line > 0 ? finding.line : std::numeric_limits<std::int64_t>::max();
+    };
+    std::stable_sort(m_list.begin(), m_list.end(),
+                     [&place](const Finding& a, const Finding& b) { return place(a) < place(b); });
 }
 
 } // namespace dcm
