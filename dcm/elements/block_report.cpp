@@ -63,6 +63,14 @@ bool IsBlank(std::string_view text)
     return TrimWhite(text).empty();
 }
 
+/// Whether a finding of the kind says that content is altered.
+bool IsOfAlteredContent(FindingKind kind)
+{
+    return kind == FindingKind::kTextTrimmed || kind == FindingKind::kTextAltered ||
+           kind == FindingKind::kEmptyTextDropped || kind == FindingKind::kLostNan ||
+           kind == FindingKind::kNotInCodePage;
+}
+
 } // namespace
 
 bool IsKindKeyword(std::string_view word)
@@ -123,7 +131,7 @@ void BlockReport::Start(const FileBlock& block)
     m_firstLine = m_line = block.LineNumber(0);
     m_labelled = false;
     m_slotsUsed = 0;
-    m_end = m_textAfterEnd = false;
+    m_end = m_textAfterEnd = m_otherBlock = false;
     m_referenceX = m_referenceY = false;
     m_variantLines.clear();
     m_noName = false;
@@ -258,6 +266,7 @@ bool BlockReport::LookForKind(std::size_t index)
     const std::string_view word = WordOf(line);
     if (index == 0 || !IsKindKeyword(word))
         return false;
+    m_otherBlock = m_textAfterEnd = true;
     const std::int64_t number = m_block->LineNumber(index);
     if (IsBlank(Line(index - 1))) {
         Add(FindingKind::kBlankSeparator, SeverityOf(FindingKind::kBlankSeparator), number,
@@ -283,10 +292,9 @@ void BlockReport::KeywordLine(std::size_t index, std::string_view keyword, std::
         LookAtCharacters(Line(index));
     // The lines of points have short keywords, and a file consists of them.
     m_known = LookForKind(index, keyword);
-    if (m_known) {
-        // All that follows is that block's, and known to be lost or in the wrong place.
-        m_textAfterEnd = true;
-    } else if (m_end) {
+    if (m_known)
+        return;
+    if (m_end) {
         m_known = true;
         AfterEnd();
     } else if (EqualsNoCase(keyword, keyword::kEnd)) {
@@ -490,6 +498,8 @@ void BlockReport::SingleValue()
 
 void BlockReport::Repeated(std::string_view keyword, std::string_view content, bool empty)
 {
+    if (m_otherBlock)
+        return;
     const auto used = std::span(m_slots).first(m_slotsUsed);
     const auto slot =
         std::ranges::find_if(used, [&](const Slot& s) { return EqualsNoCase(keyword, s.keyword); });
@@ -661,6 +671,8 @@ void BlockReport::CountDiffers(std::int64_t count, std::size_t items, const wcha
 void BlockReport::Add(FindingKind kind, Severity severity, std::int64_t line,
                       std::initializer_list<MessagePart> message) noexcept
 {
+    if (m_compared && IsOfAlteredContent(kind))
+        return;
     if (m_findings.Count(kind, severity))
         m_findings.List(kind, severity, line, Label(), message);
 }

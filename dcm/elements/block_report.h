@@ -66,6 +66,9 @@ public:
         kReplaced,
     };
     void SetBadBytes(BadBytes badBytes) { m_badBytes = badBytes; }
+    /// From here on the blocks are compared with those that they were written from, which finds all
+    /// that was altered: only other things are reported.
+    void LeaveAlteredToComparison() { m_compared = true; }
 
     // For who cuts the file into blocks.
 
@@ -193,6 +196,7 @@ private:
     CString m_label;
     bool m_labelled = false;
     BadBytes m_badBytes = BadBytes::kNone;
+    bool m_compared = false;
     bool m_inComment = false;
     std::size_t m_index = 0;
     /// Whether the line in hand needs no further look.
@@ -205,6 +209,8 @@ private:
     std::size_t m_slotsUsed = 0;
     bool m_end = false;
     bool m_textAfterEnd = false;
+    /// Whether the lines from here on are those of another block, which is reported as lost.
+    bool m_otherBlock = false;
     bool m_referenceX = false;
     bool m_referenceY = false;
     std::vector<std::int32_t> m_variantLines;

@@ -62,18 +62,13 @@ enum class TextRole : unsigned char
     kValue,
 };
 
-bool IsTrimmed(wchar_t c)
-{
-    return c == L'"' || c == L' ' || (c >= L'\t' && c <= L'\r');
-}
-
+/// The text without quotes and white space at its ends.
 std::wstring_view Trimmed(std::wstring_view text)
 {
-    while (!text.empty() && IsTrimmed(text.front()))
-        text.remove_prefix(1);
-    while (!text.empty() && IsTrimmed(text.back()))
-        text.remove_suffix(1);
-    return text;
+    constexpr const wchar_t* trimmed = L"\" \t\n\v\f\r";
+    text.remove_prefix(std::min(text.find_first_not_of(trimmed), text.size()));
+    // One past the last other character; 0 where there is none.
+    return text.substr(0, text.find_last_not_of(trimmed) + 1);
 }
 
 /// What became of the characters of a text.
@@ -231,10 +226,12 @@ private:
     {
         if (wrote.empty()) {
             Add(FindingKind::kNoValue, {L"The block has no value; it is written with 0.0."});
-        } else if (read.empty() || wrote.front().vt == read.front().vt || IsNumber(wrote.front())) {
-            CompareItems(wrote, read);
+            return;
         }
-        // Otherwise a truth word, which was reported when it was read back.
+        // A truth word was reported when it was read back.
+        const bool truthWord = IsText(wrote.front()) && !read.empty() && IsNumber(read.front());
+        if (!truthWord)
+            CompareItems(wrote, read);
     }
 
     void CompareList(const Parameter& wrote, const Parameter& read)
@@ -339,6 +336,7 @@ public:
     /// After the header text and the version.
     void EndTop()
     {
+        m_report.Block().LeaveAlteredToComparison();
         Guard([&] {
             if (!m_document.GetComment().IsEmpty() &&
                 m_document.GetComment() != m_read.GetComment()) {
@@ -356,33 +354,36 @@ public:
     template <class Block>
     void ReadBlock(ExportedFile& file, const Block& block)
     {
-        Guard([&] {
-            const Parameter wrote = ParameterOf(block);
-            const std::int64_t line = m_line;
-            CString label(KeywordOf(wrote.kind));
-            label.Append(L" ").Append(wrote.name);
-            const bool written = Read(file);
-            Comparer comparer(m_findings, written ? line : 0, label);
-            if (HasUnwrittenNumbers(block)) {
-                comparer.Add(FindingKind::kValueNotWritten,
-                             {L"Numbers that were added with a keyword are not written."});
-            }
-            if (!written)
-                return comparer.NothingWritten(wrote);
-            const std::vector<Parameter> read = ParametersOf(m_read);
-            if (read.size() != 1 || read.front().kind != wrote.kind) {
-                return comparer.Add(FindingKind::kTextAltered, Severity::kError,
-                                    {L"The block is read back as ", read.size(),
-                                     L" blocks, or as one of another kind."});
-            }
-            comparer.Compare(wrote, read.front());
-            m_report.Keep(block, static_cast<std::size_t>(wrote.kind), line, {}, false);
-        });
+        Guard([&] { ReadBlock(file, block, ParameterOf(block), HasUnwrittenNumbers(block)); });
     }
 
     void End() { m_report.End(m_document); }
 
 private:
+    void ReadBlock(ExportedFile& file, const DCMBaseType& block, const Parameter& wrote,
+                   bool hasUnwrittenNumbers)
+    {
+        const std::int64_t line = m_line;
+        CString label(KeywordOf(wrote.kind));
+        label.Append(L" ").Append(wrote.name);
+        const bool written = Read(file);
+        Comparer comparer(m_findings, written ? line : 0, label);
+        if (hasUnwrittenNumbers) {
+            comparer.Add(FindingKind::kValueNotWritten,
+                         {L"Numbers that were added with a keyword are not written."});
+        }
+        if (!written)
+            return comparer.NothingWritten(wrote);
+        const std::vector<Parameter> read = ParametersOf(m_read);
+        if (read.size() != 1 || read.front().kind != wrote.kind) {
+            return comparer.Add(FindingKind::kTextAltered, Severity::kError,
+                                {L"The block is read back as ", read.size(),
+                                 L" blocks, or as one of another kind."});
+        }
+        comparer.Compare(wrote, read.front());
+        m_report.Keep(block, static_cast<std::size_t>(wrote.kind), line, {}, false);
+    }
+
     template <class Work>
     void Guard(Work work)
     {

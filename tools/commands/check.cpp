@@ -40,12 +40,16 @@ struct Checked
             count -= itsSeverity == severity && IsTold(id) ? ofExport.Count(id) : 0;
         return count;
     }
-    /// The findings of the import, or those of the export without what the import has told.
+    /// The findings of the import, or those of the export without what the import has told. Lines
+    /// of the export are not those of the file.
     std::vector<Finding> FindingsOf(const Report& report) const
     {
         std::vector<Finding> findings = report.Findings();
-        if (&report == &ofExport)
+        if (&report == &ofExport) {
             std::erase_if(findings, [&](const Finding& finding) { return IsTold(finding.id); });
+            for (Finding& finding : findings)
+                finding.line = 0;
+        }
         return findings;
     }
     bool Incomplete() const { return ofImport.Incomplete() || ofExport.Incomplete(); }
