@@ -45,7 +45,7 @@ struct DocumentIo
                         document.m_listGruppenkennfeld, document.m_listTextstring);
     }
 
-    /// What the document's Import does; failures are raised. `stage` tells how far it came.
+    /// What the document's Import does; failures are raised. `stage` is how far it came.
     /// Nothing is reported when `report` is null.
     static void Import(DCMConverter& document, const CString& path, FileStage& stage,
                        ImportReport* report);

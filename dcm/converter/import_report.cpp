@@ -136,7 +136,8 @@ void ImportReport::CompareNames()
                                       [&](const Kept& kept) { return kept.hash != group->hash; });
         const bool repeats = end - group > 1;
         for (auto kept = group; kept != end; ++kept) {
-            // Names of equal hashes are equal, but for an accident that only tells too much.
+            // Different names with equal hashes are next to impossible; they would only turn a note
+            // into a warning.
             for (std::uint32_t i = 0; i < kept->variants; ++i) {
                 Add(FindingKind::kVariantLine, repeats ? Severity::kWarning : Severity::kNote,
                     m_variantLines[kept->firstVariant + i], LabelOf(*kept->block, kept->kind),

@@ -8,7 +8,7 @@
 #include <vector>
 
 /// The fields of blocks that their members hand out as copies or not at all: references to them,
-/// for whoever moves them out of a block or into it. `BlockIo::FieldsOf` returns them.
+/// for code that moves them out of a block or into it. `BlockIo::FieldsOf` returns them.
 namespace dcm {
 
 struct ValueFields

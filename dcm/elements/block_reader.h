@@ -38,7 +38,7 @@ public:
 
     /// The block's text, which turns parts of a line into wide texts.
     const FileText& Text() const { return m_block.Text(); }
-    /// Who is told what the reader meets; null for nobody.
+    /// Takes the findings of the reader; null when nothing is reported.
     BlockReport* Report() const { return m_report; }
     /// The wide form of what the line taken last sets: a name that is all of its rest or its first
     /// word, an attribute or unit, or the name of a distribution.

@@ -387,7 +387,7 @@ void BlockReport::UnknownLine()
     Add(FindingKind::kUnknownLine, {L"The line ", Quote(line), L" is not read in such a block."});
 }
 
-/// Notes the line; whether it is told as a warning is known at the end of the file.
+/// Keeps the line's number. Whether it is a warning depends on the rest of the file.
 void BlockReport::NoteVariantLine()
 {
     try {
@@ -543,7 +543,7 @@ void BlockReport::BeginTexts()
     m_quoted = m_texts.starts_with('"');
 }
 
-/// Takes the next text as a reader would who knows of nothing but pairs of quotes. False when there
+/// Takes the next text as what lies between a pair of quotes, by no other rule. False when there
 /// is none, or when it is not that simple.
 bool BlockReport::TakeText(std::string_view& text)
 {

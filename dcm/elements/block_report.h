@@ -128,7 +128,7 @@ public:
     void KeptText(std::string_view kept);
     void EndTexts();
 
-    /// Reports what the line in hand, or the whole block, gives cause for.
+    /// Adds a finding about the current line or the whole block.
     void Add(FindingKind kind, std::initializer_list<MessagePart> message) noexcept
     {
         Add(kind, SeverityOf(kind), m_line, message);
@@ -199,7 +199,7 @@ private:
     bool m_compared = false;
     bool m_inComment = false;
     std::size_t m_index = 0;
-    /// Whether the line in hand needs no further look.
+    /// Whether the current line needs no further check.
     bool m_known = false;
     std::int64_t m_firstLine = 0;
     std::int64_t m_line = 0;

@@ -9,7 +9,7 @@ namespace dcm {
 
 namespace {
 
-/// Tools tell a block's first line and its marks from the rest by this indent.
+/// Tools find a block's first line and its marks by the indent of the other lines.
 constexpr std::string_view kIndent = "    ";
 
 /// What follows a number that shares its line with others.

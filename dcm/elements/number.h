@@ -61,7 +61,7 @@ public:
     /// The text must outlive the reader. `kReadAhead` characters after it must be readable, and a
     /// number must not be able to go on with the first of them: texts of a file end before white
     /// space, a quote or a zero.
-    /// Tokens that are no plain number are told to `report`, if that is not null.
+    /// Tokens that are no plain number are reported to `report`, if that is not null.
     explicit NumberReader(std::string_view text, BlockReport* report = nullptr) noexcept
         : m_at(text.empty() ? nullptr : text.data()), m_end(text.data() + text.size()),
           m_report(report)

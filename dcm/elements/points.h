@@ -18,7 +18,7 @@
 namespace dcm {
 
 /// An array of points with its type: `VT_EMPTY` while it has none, the tag of the first point, and
-/// `VT_ERROR` for good from the first point of another tag on.
+/// `VT_ERROR` from the first point of another tag on.
 struct PointArray
 {
     std::vector<CComVariant>& points;
@@ -48,7 +48,7 @@ void ReservePoints(std::initializer_list<AnnouncedPoints> arrays, const FileBloc
 
 /// Reads the items of one point line, `rest`, which is a part of `text`: quoted texts when it
 /// begins and ends with a double quote, numbers otherwise. Items of a kind without an array are
-/// dropped. What the line gives cause for is told to `report`, if that is not null.
+/// dropped. Findings go to `report`, if that is not null.
 void ReadPoints(std::string_view rest, const FileText& text, const PointArray* numbers,
                 const PointArray* texts, BlockReport* report);
 

@@ -56,7 +56,7 @@ Kind KindOf(const CString& keyword, std::initializer_list<Kind> family)
     return kind == family.end() ? *family.begin() : *kind;
 }
 
-/// What a parameter holds of a value: the number that it stands for, a text, or nothing.
+/// Turns a value into what a parameter holds: its number, its text, or nothing.
 void MakePlain(CComVariant& value)
 {
     if (value.vt == VT_R8 || value.vt == VT_BSTR)

@@ -77,14 +77,14 @@ DCM_API HRESULT Import(DCMConverter& document, const CString& path, Report& repo
 DCM_API HRESULT Export(const DCMConverter& document, const CString& path, Report& report);
 
 /// Exports to a new file beside the one at `path`, writes it through to the disk and renames it:
-/// the file at `path` is whole and old or whole and new, whatever happens. A link is followed, and
+/// the file at `path` is always either whole and old or whole and new. A link is followed, and
 /// the mode of an existing file is kept. Where the path is not a regular file, such as a device, it
 /// is written directly. Returns 0, or `E_UNEXPECTED` when that fails: the old file is then as it
 /// was, and the new one is removed. The report is emptied first. Throws nothing.
 DCM_API HRESULT Save(const DCMConverter& document, const CString& path, Report& report);
 
-/// The path of the system's null device. An export to it tells what a file would lose and keeps
-/// nothing.
+/// The path of the system's null device. An export to it reports what a file would lose and
+/// writes nothing.
 DCM_API CString NullDevice();
 
 } // namespace dcm

@@ -61,7 +61,7 @@ public:
     /// What a conversion leaves no trace of.
     struct Origin
     {
-        /// Whether the text was converted by the system. The rest is told only then.
+        /// Whether the text was converted by the system. The rest is set only then.
         bool converted = false;
         bool textAfterZero = false;
         bool looksLikeUtf8 = false;
@@ -141,7 +141,7 @@ public:
         m_lines.push_back({begin, begin + static_cast<std::uint32_t>(line.size())});
     }
 
-    /// Who is told what the readers of the block meet; null for nobody.
+    /// Takes the findings of the block's readers; null when nothing is reported.
     BlockReport* Report() const { return m_report; }
     void SetReport(BlockReport* report) { m_report = report; }
 

@@ -12,7 +12,7 @@ enum class Severity : unsigned char
 {
     /// Something that the library does not keep or that may be meant so; no data are lost.
     kNote,
-    /// Data are doubtful, or altered in a way that may matter.
+    /// Data are doubtful, or altered so that their meaning may change.
     kWarning,
     /// Data are lost, or the work ended before its end.
     kError,
@@ -21,10 +21,10 @@ enum class Severity : unsigned char
 /// One thing that an import or export met.
 struct Finding
 {
-    /// How much it matters.
+    /// How bad it is.
     Severity severity;
-    /// What kind of finding it is, such as "unfinished-block"; the same in all later versions. The
-    /// text is never released. docs/findings.md tells of each.
+    /// What kind of finding it is, such as "unfinished-block"; the same in all later versions. It
+    /// refers to a constant of the library. docs/findings.md describes each.
     std::string_view id;
     /// The line in the file, from 1; 0 when the finding concerns no line of a file that is read.
     std::int64_t line;
