@@ -50,12 +50,9 @@ void ReadTokens(const std::vector<double>& numbers)
     }
     const std::size_t size = line.size();
     line.append(dcm::kReadAhead, ' ');
-    Counted([&] {
-        dcm::NumberReader reader({line.data(), size});
-        std::array<double, dcm::kNumbersAtOnce> values;
-        while (reader.Next(values) == values.size()) {
-        }
-    });
+    std::vector<double> values;
+    values.reserve(numbers.size());
+    Counted([&] { dcm::ReadNumbers({line.data(), size}, nullptr, values); });
 }
 
 int Main(std::string_view what, const char* path)

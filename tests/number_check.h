@@ -4,7 +4,6 @@
 #include "dcm/platform/word.h"
 
 #include <algorithm>
-#include <array>
 #include <bit>
 #include <cfloat>
 #include <charconv>
@@ -21,6 +20,7 @@
 #include <string>
 #include <string_view>
 #include <system_error>
+#include <vector>
 
 /// Numbers and number texts of every kind from a seed: of few and of many digits, of any size,
 /// round ones, and those that are hard to round.
@@ -111,24 +111,21 @@ std::string WrongLine(const std::string& line, Expected expected)
 {
     const std::string text = line + "\"5.5e5.5"; // What follows the line must not count.
     static_assert(dcm::kReadAhead == 8);
-    dcm::NumberReader numbers({text.data(), line.size()});
-    std::array<double, dcm::kNumbersAtOnce> values;
-    std::size_t left = 0;
+    std::vector<double> numbers;
+    dcm::ReadNumbers({text.data(), line.size()}, nullptr, numbers);
     std::size_t count = 0;
-    for (std::size_t start = 0, blank = 0; !line.empty() && blank < line.size(); --left) {
-        if (left == 0)
-            left = count = numbers.Next(values);
-        if (left == 0)
+    for (std::size_t start = 0, blank = 0; !line.empty() && blank < line.size(); ++count) {
+        if (count == numbers.size())
             return "no number for" + line.substr(start);
         blank = std::min(line.find(' ', start), line.size());
         const std::string token = line.substr(start, blank - start);
         const double right = expected(token);
-        for (const double number : {values[count - left], dcm::ReadNumber(token)})
+        for (const double number : {numbers[count], dcm::ReadNumber(token)})
             if (std::bit_cast<std::uint64_t>(number) != std::bit_cast<std::uint64_t>(right))
                 return token + " is " + std::to_string(number);
         start = std::min(line.find_first_not_of(" \t\n\v\f\r", blank), line.size());
     }
-    return left + numbers.Next(values) == 0 ? "" : "a number more than tokens";
+    return count == numbers.size() ? "" : "a number more than tokens";
 }
 
 /// What is wrong with how `token` is read in lines where it is the first or only one.

@@ -159,7 +159,8 @@ inline std::uint64_t DigitBytes(const char* at)
 }
 
 /// What NotDigits marks a byte with.
-constexpr std::uint64_t kNotDigit = 0x80;
+constexpr unsigned kNotDigitBit = 7;
+constexpr unsigned char kNotDigit = 1 << kNotDigitBit;
 
 /// The highest bit of each byte that is not a digit, 0 for each that is: adding 118 sets it for 10
 /// and more. After a byte from 0x8A on, whose sum carries into the next, a digit may be marked too.
@@ -175,6 +176,13 @@ constexpr std::uint64_t JoinEight(std::uint64_t bytes)
     bytes = (bytes * 10 + (bytes >> 8)) & 0x00FF'00FF'00FF'00FF;
     bytes = (bytes * (1 + (100 << 16))) >> 16 & 0x0000'FFFF'0000'FFFF;
     return (bytes * (1 + (std::uint64_t{10'000} << 32))) >> 32;
+}
+
+/// The same for four digits.
+constexpr std::uint32_t JoinFour(std::uint32_t bytes)
+{
+    bytes = (bytes * 10 + (bytes >> 8)) & 0x00FF'00FF;
+    return (bytes * (1 + (100 << 16))) >> 16;
 }
 
 /// The reverse of JoinEight: the eight digits of a number below 10^8.

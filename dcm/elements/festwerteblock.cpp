@@ -13,7 +13,6 @@
 #include "dcm/textfile/pravfile.h"
 
 #include <algorithm>
-#include <array>
 #include <cstddef>
 #include <string>
 #include <string_view>
@@ -52,17 +51,12 @@ bool AnotherTextFollows(std::string_view rest)
            rest[next + 1] != ' ';
 }
 
-void ReadNumbers(std::string_view rest, dcm::BlockReport* report, std::vector<double>& numbers)
+/// Reads a line of numbers, of which there must be one.
+void ReadNumberLine(std::string_view rest, dcm::BlockReport* report, std::vector<double>& numbers)
 {
     if (rest.empty())
         dcm::ThrowResult(E_INVALIDARG);
-    dcm::NumberReader reader(rest, report);
-    std::array<double, dcm::kNumbersAtOnce> values;
-    std::size_t count = values.size();
-    while (count == values.size()) {
-        count = reader.Next(values);
-        numbers.insert(numbers.end(), values.begin(), values.begin() + count);
-    }
+    dcm::ReadNumbers(rest, report, numbers);
 }
 
 /// Reads a list of quoted texts.
@@ -198,7 +192,7 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwerteblock& block)
         } else if (line.Is(keyword::kEinheitW)) {
             block.m_strUnit = reader.Attribute(rest);
         } else if (line.Is(keyword::kWert)) {
-            ReadNumbers(rest, report, block.m_vecDoubleValues);
+            ReadNumberLine(rest, report, block.m_vecDoubleValues);
         } else if (line.Is(keyword::kText)) {
             ReadTextLine(TrimWhite(rest), text, report, block.m_listStringValues);
         } else {
@@ -218,7 +212,7 @@ HRESULT DCMFestwerteblock::AddValues(CString& strRest)
     if (IsQuoted(text.Bytes())) {
         ReadTexts(text.Bytes(), text, nullptr, m_listStringValues);
     } else {
-        ReadNumbers(text.Bytes(), nullptr, m_vecDoubleValues);
+        ReadNumberLine(text.Bytes(), nullptr, m_vecDoubleValues);
     }
     strRest.Empty();
     return S_OK;

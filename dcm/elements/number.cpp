@@ -4,6 +4,7 @@
 #include "dcm/elements/decimal.h"
 #include "dcm/elements/exact_decimal.h"
 #include "dcm/platform/text.h"
+#include "dcm/platform/variant.h"
 #include "dcm/platform/word.h"
 
 #include <algorithm>
@@ -15,6 +16,7 @@
 #include <cstring>
 #include <limits>
 #include <string_view>
+#include <vector>
 
 namespace dcm {
 namespace {
@@ -181,7 +183,7 @@ inline bool FitsInDecimal(const char* at, const char* end)
 inline std::uint64_t WithoutFirst(std::uint64_t bytes, std::uint64_t others)
 {
     const auto upToFirst = others ^ (others - 1);
-    return (bytes & ~upToFirst) | (bytes & upToFirst >> 8) << 8;
+    return bytes ^ ((bytes ^ bytes << 8) & upToFirst);
 }
 
 /// TakeFixed for a number whose first eight characters are digits.
@@ -204,6 +206,19 @@ inline const char* TakeLongFraction(const char* at, std::uint64_t digits, std::s
 {
     const auto seven = JoinEight(digits);
     decimal.digits = seven;
+    const auto eight = DigitBytes(at + 8);
+    if (NotDigits(eight) == 0) {
+        const auto bytes = DigitBytes(at + 16);
+        const auto mark = static_cast<unsigned>(std::countr_zero(NotDigits(bytes)));
+        if (mark < 5 * 8) {
+            // Numbers with all their digits have up to 19, the last 4 of them in this word.
+            const auto last = static_cast<std::uint32_t>(bytes << (4 * 8 + kNotDigitBit - mark));
+            const std::size_t size = mark / 8;
+            decimal.exponent = static_cast<int>(point) - 15 - static_cast<int>(size);
+            decimal.digits = (seven * kTenTo8 + JoinEight(eight)) * kTens[size] + JoinFour(last);
+            return at + 16 + size;
+        }
+    }
     const auto* const end = TakeDigits(at + 8, decimal.digits);
     const auto count = end - at - 8;
     const bool fits =
@@ -268,6 +283,21 @@ inline double SignedDouble(Decimal decimal, std::uint64_t sign)
     if (!ToDouble(decimal, value)) [[unlikely]]
         value = NearestDouble(decimal);
     return std::bit_cast<double>(std::bit_cast<std::uint64_t>(value) | sign);
+}
+
+/// The first character after the blanks at `at`, or `end`.
+inline const char* SkipBlanks(const char* at, const char* end)
+{
+    for (; at < end; at += 8) {
+        const auto others = LoadWord(at) ^ RepeatByte(' ');
+        if (others != 0) {
+            at += LowestByteSet(others);
+            break;
+        }
+    }
+    if (at > end) [[unlikely]]
+        at = end;
+    return at;
 }
 
 /// Reads the token from `at` to `end`, where a number cannot go on. Few forms need ReadToken.
@@ -396,29 +426,38 @@ NumberFault FaultOf(std::string_view token, double value) noexcept
     return rest.empty() ? NumberFault::kNone : NumberFault::kCut;
 }
 
-std::size_t NumberReader::Next(std::span<double> values) noexcept
+template <class Number>
+void ReadNumbers(std::string_view text, BlockReport* report, std::vector<Number>& numbers)
 {
-    const char* at = m_at;
-    const char* const end = m_end;
-    std::size_t count = 0;
-    for (; at != nullptr && count < values.size(); ++count) {
+    if (text.empty())
+        return;
+    const char* at = text.data();
+    const char* const end = at + text.size();
+    for (;;) {
         const auto* last = at;
         const auto sign = TakeMinus(last);
         Decimal decimal;
         last = TakeFixed(last, decimal);
         if (last != nullptr && (*last == ' ' || last == end)) [[likely]] {
-            values[count] = SignedDouble(decimal, sign);
+            numbers.emplace_back(SignedDouble(decimal, sign));
         } else {
+            // Only after a blank is white space of other kinds skipped.
+            at = at == text.data() ? at : SkipWhite(at, end);
             last = std::find(at, end, ' ');
-            values[count] = ReadKnownToken(at, last);
-            if (m_report != nullptr)
-                m_report->Number({at, last}, values[count]);
+            const double number = ReadKnownToken(at, last);
+            numbers.emplace_back(number);
+            if (report != nullptr)
+                report->Number({at, last}, number);
         }
-        at = last < end ? SkipWhite(last + 1, end) : nullptr;
+        if (last >= end)
+            return;
+        at = SkipBlanks(last, end);
     }
-    m_at = at;
-    return count;
 }
+
+template void ReadNumbers(std::string_view text, BlockReport* report, std::vector<double>& numbers);
+template void ReadNumbers(std::string_view text, BlockReport* report,
+                          std::vector<CComVariant>& numbers);
 
 std::int32_t ReadInteger(std::string_view text) noexcept
 {

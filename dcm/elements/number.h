@@ -2,8 +2,8 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <span>
 #include <string_view>
+#include <vector>
 
 namespace dcm {
 
@@ -51,34 +51,17 @@ NumberFault FaultOf(std::string_view token, double value) noexcept;
 
 class BlockReport;
 
-/// How many numbers are read at once. More of them would not be faster.
-inline constexpr std::size_t kNumbersAtOnce = 16;
-
-/// Reads the numbers of a text in which they are separated by blanks.
-class NumberReader
-{
-public:
-    /// The text must outlive the reader. `kReadAhead` characters after it must be readable, and a
-    /// number must not be able to go on with the first of them: texts of a file end before white
-    /// space, a quote or a zero.
-    /// Tokens that are no plain number are reported to `report`, if that is not null.
-    explicit NumberReader(std::string_view text, BlockReport* report = nullptr) noexcept
-        : m_at(text.empty() ? nullptr : text.data()), m_end(text.data() + text.size()),
-          m_report(report)
-    {}
-
-    /// Reads the next numbers, as many as there is room for, and returns how many; there are fewer
-    /// at the end of the text. Each is what ReadNumber returns for the token before the next blank,
-    /// or for the rest of the text; white space after that blank is skipped. After the last blank
-    /// there is a token even if nothing follows. An empty text has no number.
-    std::size_t Next(std::span<double> values) noexcept;
-
-private:
-    /// The start of the next token, or null when there is none.
-    const char* m_at;
-    const char* m_end;
-    BlockReport* m_report;
-};
+/// Reads the numbers of a text in which they are separated by blanks, and appends them to
+/// `numbers`, whose items are doubles or variants. Each is what ReadNumber returns for the token
+/// before the next blank, or for the rest of the text; white space after that blank is skipped.
+/// After the last blank there is a token even if nothing follows. An empty text has no number.
+///
+/// `kReadAhead` characters after the text must be readable, and a number must not be able to go on
+/// with the first of them: texts of a file end before white space, a quote or a zero. Tokens that
+/// are no plain number are reported to `report`, if that is not null. When memory runs out, the numbers
+/// before that have been appended.
+template <class Number>
+void ReadNumbers(std::string_view text, BlockReport* report, std::vector<Number>& numbers);
 
 /// The decimal integer at the start of `text`: white space, a sign, digits; what follows is
 /// ignored. Saturates at the limits of 32 bits; 0 without digits.

@@ -6,7 +6,6 @@
 #include "dcm/platform/word.h"
 
 #include <algorithm>
-#include <array>
 #include <utility>
 
 namespace dcm {
@@ -40,21 +39,28 @@ VARTYPE JoinType(VARTYPE type, CComVariant& point)
     return type;
 }
 
-void ReadNumbers(std::string_view rest, const PointArray& array, BlockReport* report)
+/// Gives the array, when it is destroyed, the type that appending the new points one by one gives.
+class NewPoints
 {
-    NumberReader numbers(rest, report);
-    std::array<double, kNumbersAtOnce> values;
-    std::size_t count = values.size();
-    while (count == values.size()) {
-        count = numbers.Next(values);
-        const std::span<const double> read(values.data(), count);
-        if (array.type == VT_R8) {
-            array.points.insert(array.points.end(), read.begin(), read.end());
-        } else {
-            for (const double number : read)
-                AppendPoint(array, CComVariant(number));
-        }
+public:
+    explicit NewPoints(const PointArray& array) : m_array(array), m_before(array.points.size()) {}
+    NewPoints(const NewPoints&) = delete;
+    NewPoints& operator=(const NewPoints&) = delete;
+    ~NewPoints()
+    {
+        for (std::size_t i = m_before; m_array.type != VT_R8 && i < m_array.points.size(); ++i)
+            m_array.type = JoinType(m_array.type, m_array.points[i]);
     }
+
+private:
+    const PointArray& m_array;
+    std::size_t m_before;
+};
+
+void ReadPointNumbers(std::string_view rest, const PointArray& array, BlockReport* report)
+{
+    const NewPoints points(array);
+    ReadNumbers(rest, report, array.points);
 }
 
 /// A text begins after an opening quote, which is any character that follows the text before it,
@@ -118,7 +124,8 @@ void ReservePoints(std::initializer_list<AnnouncedPoints> arrays, const FileBloc
 void ReadPoints(std::string_view rest, const FileText& text, const PointArray* numbers,
                 const PointArray* texts, BlockReport* report)
 {
-    rest = TrimWhite(rest);
+    const char* const end = rest.data() + rest.size();
+    rest = TrimRight({SkipWhite(rest.data(), end), end}, IsWhite);
     const bool quoted = rest.starts_with('"') && rest.ends_with('"');
     const PointArray* const array = quoted ? texts : numbers;
     if (array == nullptr) {
@@ -130,7 +137,7 @@ void ReadPoints(std::string_view rest, const FileText& text, const PointArray* n
     if (quoted) {
         ReadTexts(rest, text, *array, report);
     } else {
-        ReadNumbers(rest, *array, report);
+        ReadPointNumbers(rest, *array, report);
     }
     if (report != nullptr && !mixed && array->type == VT_ERROR)
         report->MixedTypes();
@@ -143,11 +150,11 @@ bool PointReader::Read(const BlockLine& line)
     if (size == 0 || size > sizeof(std::uint64_t))
         return false;
     const std::uint64_t all = ~std::uint64_t{0} >> (64 - 8 * size);
-    const Line found = {size, LoadWord(line.keyword.data()) & all};
-    if (!found.HasKeywordOf(*m_last)) {
+    const std::uint64_t keyword = LoadWord(line.keyword.data()) & all;
+    if (m_last->keyword != keyword) {
         std::swap(m_last, m_other);
-        if (!found.HasKeywordOf(*m_last)) {
-            *m_last = found;
+        if (m_last->keyword != keyword) {
+            *m_last = {keyword};
             Find(line.keyword, *m_last);
         }
     }

@@ -91,19 +91,13 @@ public:
     bool Read(const BlockLine& line);
 
 private:
-    /// A keyword, its characters in one word, and the array that takes what its lines hold, if
-    /// there is one.
+    /// The characters of a keyword, none of which is zero, in one word, and the array that takes
+    /// what its lines hold, if there is one.
     struct Line
     {
-        std::size_t size = 0;
         std::uint64_t keyword = 0;
         const PointArray* numbers = nullptr;
         const PointArray* texts = nullptr;
-
-        bool HasKeywordOf(const Line& other) const
-        {
-            return size == other.size && keyword == other.keyword;
-        }
     };
 
     void Find(std::string_view keyword, Line& line) const;
