@@ -8,17 +8,13 @@ namespace dcm {
 
 namespace {
 
-/// The first character at or after `at` that is a blank or lower, which is where a word ends; `end`
-/// or later when there is none.
-const char* SkipWord(const char* at, const char* end)
+/// The first blank at or after `at`; `end` or later when there is none.
+const char* FindBlank(const char* at, const char* end)
 {
     for (; at < end; at += 8) {
-        // The subtraction sets the highest bit of bytes below 0x21. A borrow may set it in the
-        // bytes after such a byte as well, but only the first one counts.
-        const std::uint64_t text = LoadWord(at);
-        const std::uint64_t low = (text - RepeatByte(0x21)) & ~text & RepeatByte(0x80);
-        if (low != 0)
-            return at + LowestByteSet(low);
+        const std::uint64_t blanks = BytesBelow(LoadWord(at) ^ RepeatByte(' '), 1);
+        if (blanks != 0)
+            return at + LowestByteSet(blanks);
     }
     return at;
 }
@@ -37,27 +33,15 @@ std::string_view TakeWord(std::string_view& rest)
     return TrimRight(text.substr(0, blank), IsWhite);
 }
 
-bool BlockReader::Next(BlockLine& line)
+bool CutLine(std::string_view bytes, BlockLine& line)
 {
-    while (m_next < m_block.LineCount()) {
-        const std::string_view bytes = m_block.Line(m_next++);
-        const char* const end = bytes.data() + bytes.size();
-        const char* const start = SkipWhite(bytes.data(), end);
-        const char* blank = SkipWord(start, end);
-        while (blank < end && *blank != ' ')
-            blank = SkipWord(blank + 1, end);
-        if (blank < end) {
-            line = {{start, blank}, {blank + 1, end}};
-            if (m_report != nullptr)
-                m_report->KeywordLine(m_next - 1, line.keyword, line.rest);
-            return true;
-        }
-        if (m_report != nullptr)
-            m_report->OtherLine(m_next - 1, bytes);
-    }
-    if (m_report != nullptr)
-        m_report->End();
-    return false;
+    const char* const end = bytes.data() + bytes.size();
+    const char* const start = SkipWhite(bytes.data(), end);
+    const char* const blank = FindBlank(start, end);
+    if (blank >= end)
+        return false;
+    line = {{start, blank}, {blank + 1, end}};
+    return true;
 }
 
 } // namespace dcm

@@ -20,6 +20,9 @@ struct BlockLine
     bool Is(std::wstring_view other) const { return EqualsNoCase(keyword, other); }
 };
 
+/// Cuts a line, before which white space is skipped, at the first blank; false when it has none.
+bool CutLine(std::string_view bytes, BlockLine& line);
+
 /// Takes the first word off `rest`: the text before the first blank. `rest` keeps what follows,
 /// without white space at its ends. Without a blank the word is empty and `rest` keeps all of it.
 /// Callers must strip leading white space first.
@@ -34,7 +37,20 @@ public:
     explicit BlockReader(const FileBlock& block) : m_block(block), m_report(block.Report()) {}
 
     /// Takes the next such line; false at the end of the block.
-    bool Next(BlockLine& line);
+    bool Next(BlockLine& line)
+    {
+        while (m_next < m_block.LineCount()) {
+            const std::string_view bytes = m_block.Line(m_next++);
+            const bool found = CutLine(bytes, line);
+            if (m_report != nullptr)
+                TellLine(bytes, found ? &line : nullptr);
+            if (found)
+                return true;
+        }
+        if (m_report != nullptr)
+            m_report->End();
+        return false;
+    }
 
     /// The block's text, which turns parts of a line into wide texts.
     const FileText& Text() const { return m_block.Text(); }
@@ -75,6 +91,15 @@ public:
     }
 
 private:
+    void TellLine(std::string_view bytes, const BlockLine* line) const
+    {
+        if (line != nullptr) {
+            m_report->KeywordLine(m_next - 1, line->keyword, line->rest);
+        } else {
+            m_report->OtherLine(m_next - 1, bytes);
+        }
+    }
+
     const FileBlock& m_block;
     BlockReport* m_report;
     std::size_t m_next = 0;

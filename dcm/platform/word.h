@@ -42,6 +42,14 @@ constexpr std::uint64_t RepeatByte(unsigned char value)
     return value * std::uint64_t{0x0101'0101'0101'0101};
 }
 
+/// The highest bit of the lowest byte of `word` that is below `limit`, which is at most 0x80; 0
+/// when there is none. Bits of bytes above that one may be set too.
+constexpr std::uint64_t BytesBelow(std::uint64_t word, unsigned char limit)
+{
+    // The subtraction borrows from the next byte only where a byte is below the limit.
+    return (word - RepeatByte(limit)) & ~word & RepeatByte(0x80);
+}
+
 /// The index of the lowest byte of `word` that has a bit set. `word` must not be zero.
 inline std::size_t LowestByteSet(std::uint64_t word)
 {

@@ -111,16 +111,44 @@ inline bool TakeLine(std::string_view& rest, std::string_view& line)
     return true;
 }
 
-class BlockReport;
+/// The first zero or control character up to the carriage return at or after `at`, which must be
+/// part of a text or its end.
+inline const char* FindControl(const char* at)
+{
+    constexpr unsigned char limit = '\r' + 1;
+    for (;; at += 8) {
+        const std::uint64_t word = LoadWord(at);
+        // The difference alone sets the bit for these characters and for some that are no ASCII.
+        if (((word - RepeatByte(limit)) & RepeatByte(0x80)) == 0)
+            continue;
+        const std::uint64_t controls = BytesBelow(word, limit);
+        if (controls != 0)
+            return at + LowestByteSet(controls);
+    }
+}
 
 /// The same for a line of a file, which ends before its carriage returns.
 inline bool TakeFileLine(std::string_view& rest, std::string_view& line)
 {
-    if (!TakeLine(rest, line))
+    if (rest.empty())
         return false;
-    line = TrimRight(line, [](char c) { return c == '\r'; });
-    return true;
+    const char* at = FindControl(rest.data());
+    for (;; at = FindControl(at)) {
+        const char* const end = at;
+        while (*at == '\r')
+            ++at;
+        if (*at == '\n') {
+            line = {rest.data(), end};
+            rest = {at + 1, rest.data() + rest.size()};
+            return true;
+        }
+        if (*at == '\0')
+            return false;
+        ++at;
+    }
 }
+
+class BlockReport;
 
 /// One block of a text: its lines without their line ends. The text must outlive the block.
 class FileBlock
