@@ -43,7 +43,7 @@ public:
             const std::string_view bytes = m_block.Line(m_next++);
             const bool found = CutLine(bytes, line);
             if (m_report != nullptr)
-                TellLine(bytes, found ? &line : nullptr);
+                ReportLine(bytes, found ? &line : nullptr);
             if (found)
                 return true;
         }
@@ -91,7 +91,7 @@ public:
     }
 
 private:
-    void TellLine(std::string_view bytes, const BlockLine* line) const
+    void ReportLine(std::string_view bytes, const BlockLine* line) const
     {
         if (line != nullptr) {
             m_report->KeywordLine(m_next - 1, line->keyword, line->rest);

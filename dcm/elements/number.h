@@ -58,8 +58,8 @@ class BlockReport;
 ///
 /// `kReadAhead` characters after the text must be readable, and a number must not be able to go on
 /// with the first of them: texts of a file end before white space, a quote or a zero. Tokens that
-/// are no plain number are reported to `report`, if that is not null. When memory runs out, the numbers
-/// before that have been appended.
+/// are no plain number are reported to `report`, if that is not null. When memory runs out, the
+/// numbers before that have been appended.
 template <class Number>
 void ReadNumbers(std::string_view text, BlockReport* report, std::vector<Number>& numbers);
 
