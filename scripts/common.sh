@@ -40,13 +40,12 @@ as_root() {
 
 # Configures and builds the preset named.
 build() {
-    quietly cmake --preset "$1"
-    quietly cmake --build --preset "$1"
+    quietly cmake --preset "$1" && quietly cmake --build --preset "$1"
 }
 
 # Builds the preset named, runs its tests and prints their summary.
 build_and_test() {
-    build "$1"
+    build "$1" || return
     local log=build/$1/ctest.log
     if ! ctest --preset "$1" -j "$CMAKE_BUILD_PARALLEL_LEVEL" >"$log" 2>&1; then
         cat "$log" >&2

@@ -2,12 +2,30 @@
 
 #include <cstdlib>
 #include <new>
+#include <vector>
 
 namespace test {
 
 constinit std::atomic<long> live = 0;
 constinit thread_local long untilFailure = 0;
 constinit thread_local std::size_t wanted = 0;
+
+bool LibraryLeaks()
+{
+    struct Element
+    {
+        Element() = default;
+        Element(const Element&) { throw std::bad_alloc(); }
+        void* memory = nullptr;
+    };
+    const std::vector<Element> elements(1);
+    const long before = live;
+    try {
+        const std::vector<Element> copy(elements);
+    } catch (const std::bad_alloc&) {
+    }
+    return live != before;
+}
 
 } // namespace test
 

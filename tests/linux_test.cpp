@@ -56,19 +56,23 @@ ssize_t Room(std::string_view call, std::size_t count)
 
 extern "C" {
 
-// Replaces a system call by one that may fail or transfer less.
-#define DCM_TEST_WRAP(Result, call, count, parameters, arguments)                                  \
-    Result __real_##call parameters;                                                               \
-    Result __wrap_##call parameters                                                                \
+// Replaces a system call by one that may fail or transfer less. `suffix` ends the name by which the
+// call is linked.
+#define DCM_TEST_WRAP_LINKED(suffix, Result, call, count, parameters, arguments)                   \
+    Result __real_##call##suffix parameters;                                                       \
+    Result __wrap_##call##suffix parameters                                                        \
     {                                                                                              \
         const ssize_t room = Room(#call, count);                                                   \
-        return room < 0 ? -1 : __real_##call arguments;                                            \
+        return room < 0 ? -1 : __real_##call##suffix arguments;                                    \
     }
+#define DCM_TEST_WRAP_EXPANDED(suffix, ...) DCM_TEST_WRAP_LINKED(suffix, __VA_ARGS__)
+#define DCM_TEST_WRAP(...) DCM_TEST_WRAP_LINKED(, __VA_ARGS__)
+#define DCM_TEST_WRAP_LARGE(...) DCM_TEST_WRAP_EXPANDED(DCM_TEST_LARGE_FILES, __VA_ARGS__)
 
-DCM_TEST_WRAP(int, open, 0, (const char* path, int flags, mode_t mode), (path, flags, mode))
-DCM_TEST_WRAP(int, fstat, 0, (int file, struct stat* status), (file, status))
+DCM_TEST_WRAP_LARGE(int, open, 0, (const char* path, int flags, mode_t mode), (path, flags, mode))
+DCM_TEST_WRAP_LARGE(int, fstat, 0, (int file, struct stat* status), (file, status))
 DCM_TEST_WRAP(int, flock, 0, (int file, int operation), (file, operation))
-DCM_TEST_WRAP(int, ftruncate, 0, (int file, off_t length), (file, length))
+DCM_TEST_WRAP_LARGE(int, ftruncate, 0, (int file, off_t length), (file, length))
 DCM_TEST_WRAP(ssize_t, read, count, (int file, void* to, std::size_t count),
               (file, to, static_cast<std::size_t>(room)))
 

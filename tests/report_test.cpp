@@ -319,7 +319,7 @@ TEST(Findings, AreThoseOfTheirPage)
         } else if (line == "```dcm") {
             inFile = true;
         } else if (line.starts_with("Example: ") && !IsTestedAlone(sections.back())) {
-            EXPECT_TRUE(std::ranges::any_of(exports, [&](const ExportCase& c) {
+            EXPECT_TRUE(std::any_of(exports.begin(), exports.end(), [&](const ExportCase& c) {
                 return c.title == line.substr(9) && HasId(c.expected, sections.back());
             })) << line;
         } else if (line.starts_with("## ")) {
@@ -329,7 +329,8 @@ TEST(Findings, AreThoseOfTheirPage)
             severities[0] = static_cast<char>(std::tolower(severities[0]));
         }
     }
-    EXPECT_TRUE(std::ranges::equal(sections, dcm::FindingIds()));
+    const auto ids = dcm::FindingIds();
+    EXPECT_TRUE(std::equal(sections.begin(), sections.end(), ids.begin(), ids.end()));
     EXPECT_GT(examples, 40);
 }
 

@@ -70,5 +70,8 @@ TEST(Threads, UseDocumentsOfTheirOwn)
             EXPECT_EQ(ExportBytes(back), exported);
         }
     };
-    const std::jthread one(work, 1252U), two(work, 65001U), three(work, 28591U);
+    std::thread threads[] = {std::thread(work, 1252U), std::thread(work, 65001U),
+                             std::thread(work, 28591U)};
+    for (std::thread& thread : threads)
+        thread.join();
 }

@@ -11,6 +11,7 @@
 #include <ostream>
 #include <random>
 #include <sstream>
+#include <stdexcept>
 #include <string>
 #include <string_view>
 #include <system_error>
@@ -28,6 +29,20 @@ namespace test {
 
 inline constexpr UINT kRead = CFile::modeRead;
 inline constexpr UINT kCreate = CFile::modeCreate | CFile::modeWrite;
+
+/// Chooses the code page for the thread. Returns false where the system has no converters and the
+/// page is not built in: what needs it is left out there.
+inline bool ChoosePage(unsigned page)
+{
+    const bool chosen = dcm::SetThreadCodePage(page);
+#ifdef DCM_TEST_NO_CONVERTERS
+    return chosen;
+#else
+    if (!chosen)
+        throw std::runtime_error("There is no code page " + std::to_string(page) + '.');
+    return true;
+#endif
+}
 
 /// A new folder. The destructor removes it with all that is in it.
 class Folder

@@ -1,12 +1,16 @@
 #include "tools/number_text.h"
 
 #include <bit>
+#include <cfloat>
 #include <charconv>
 #include <cmath>
 #include <cstddef>
 #include <cstdint>
 #include <iterator>
+#include <limits>
+#include <locale>
 #include <optional>
+#include <sstream>
 #include <string>
 #include <string_view>
 #include <system_error>
@@ -16,6 +20,7 @@ namespace dcm::tools {
 namespace {
 
 constexpr std::uint64_t kUsualNan = 0x7FF8000000000000;
+constexpr std::string_view kInfinity = "inf";
 constexpr std::string_view kNanWithBits = "nan:";
 constexpr std::size_t kDigits = 16;
 
@@ -40,6 +45,37 @@ std::optional<double> NanOf(std::string_view digits)
     if (digits.size() != kDigits || stop != end || error != std::errc() || !std::isnan(number))
         return std::nullopt;
     return number;
+}
+
+/// The finite number that the whole of a text is in decimal notation.
+template <class Number = double>
+std::optional<Number> DecimalOf(std::string_view text)
+{
+    Number number = 0;
+    const char* const end = text.data() + text.size();
+    // Not every standard library has it for doubles. Where registers are wider than a double, some
+    // round twice.
+    if constexpr (FLT_EVAL_METHOD == 0 && requires { std::from_chars(end, end, number); }) {
+        const auto [stop, error] = std::from_chars(text.data(), end, number);
+        if (stop != end || error != std::errc())
+            return std::nullopt;
+    } else {
+        // A stream takes blanks, a plus sign and hexadecimal digits too, has zero for what is too
+        // small, and fails at the smallest numbers although it reads them.
+        if (text.empty() || text[0] == '+' ||
+            text.find_first_not_of("0123456789.+-eE") != text.npos)
+            return std::nullopt;
+        std::istringstream stream{std::string(text)};
+        stream.imbue(std::locale::classic());
+        stream >> number;
+        const bool isZero =
+            text.substr(0, text.find_first_of("eE")).find_first_of("123456789") == text.npos;
+        const bool isTiny = std::abs(number) < 1 && number != 0;
+        if (isZero != (number == 0) || (stream.fail() && !isTiny) ||
+            stream.rdbuf()->in_avail() != 0)
+            return std::nullopt;
+    }
+    return std::isfinite(number) ? std::optional(number) : std::nullopt;
 }
 
 } // namespace
@@ -68,13 +104,11 @@ std::optional<double> NumberOf(std::string_view text)
         return std::bit_cast<double>(kUsualNan);
     if (text.starts_with(kNanWithBits))
         return NanOf(text.substr(kNanWithBits.size()));
-    double number = 0.0;
-    const auto* const end = text.data() + text.size();
-    const auto [stop, error] = std::from_chars(text.data(), end, number);
-    // What is left are other spellings of not-a-number.
-    if (text.empty() || stop != end || error != std::errc() || std::isnan(number))
-        return std::nullopt;
-    return number;
+    if (text == kInfinity)
+        return std::numeric_limits<double>::infinity();
+    if (text.starts_with('-') && text.substr(1) == kInfinity)
+        return -std::numeric_limits<double>::infinity();
+    return DecimalOf(text);
 }
 
 } // namespace dcm::tools

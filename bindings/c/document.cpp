@@ -99,8 +99,9 @@ dcm_parameter* Append(dcm_document& document, dcm::Parameter&& content)
 /// The place of a parameter in its document.
 Parameters::iterator PlaceOf(dcm_document& document, const dcm_parameter& parameter)
 {
-    return std::ranges::lower_bound(document.parameters, parameter.number, {},
-                                    [](const auto& p) { return p->number; });
+    return std::lower_bound(document.parameters.begin(), document.parameters.end(),
+                            parameter.number,
+                            [](const auto& p, auto number) { return p->number < number; });
 }
 
 } // namespace

@@ -21,7 +21,8 @@ constexpr std::string_view kReplacement = "\xEF\xBF\xBD";
 
 std::int64_t LineAt(std::string_view bytes, std::size_t at, std::int32_t number)
 {
-    return number + std::ranges::count(bytes.substr(0, at), '\n');
+    const std::string_view before = bytes.substr(0, at);
+    return number + std::count(before.begin(), before.end(), '\n');
 }
 
 bool SamePoint(const CComVariant& a, const CComVariant& b)
@@ -113,7 +114,7 @@ void ImportReport::End(const DCMConverter& document) noexcept
         return;
     try {
         const auto refers = [](const Kept& kept) { return kept.references; };
-        if (std::ranges::any_of(*m_kept, refers)) {
+        if (std::any_of(m_kept->begin(), m_kept->end(), refers)) {
             SetDistributions(document);
             for (const Kept& kept : *m_kept) {
                 if (kept.references)
@@ -128,7 +129,7 @@ void ImportReport::End(const DCMConverter& document) noexcept
 
 void ImportReport::CompareNames()
 {
-    std::ranges::sort(*m_kept, [](const Kept& a, const Kept& b) {
+    std::sort(m_kept->begin(), m_kept->end(), [](const Kept& a, const Kept& b) {
         return a.hash != b.hash ? a.hash < b.hash : a.line < b.line;
     });
     for (auto group = m_kept->begin(); group != m_kept->end();) {
@@ -176,7 +177,7 @@ void ImportReport::CompareAxes(const DCMBaseType& block, std::size_t kind, std::
         if (points.empty())
             return;
         found->second->GetValues(shared);
-        if (!std::ranges::equal(points, shared, SamePoint)) {
+        if (!std::equal(points.begin(), points.end(), shared.begin(), shared.end(), SamePoint)) {
             Add(FindingKind::kDistributionDiffers, Severity::kWarning, line, LabelOf(block, kind),
                 {L"The axis points differ from those of the distribution ",
                  MessagePart::Quoted(name), L"."});

@@ -37,7 +37,8 @@ constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
 
 bool IsOneOf(std::string_view word, std::span<const std::wstring_view> keywords)
 {
-    return std::ranges::any_of(keywords, [&](auto k) { return EqualsNoCase(word, k); });
+    return std::any_of(keywords.begin(), keywords.end(),
+                       [&](auto k) { return EqualsNoCase(word, k); });
 }
 
 /// What a rest of a line means as one text: what is between its quotes, or all of it.
@@ -80,7 +81,7 @@ bool IsKindKeyword(std::string_view word)
 
 std::string_view WordOf(std::string_view text)
 {
-    const auto* const end = std::ranges::find_if(text, IsWhite);
+    const auto* const end = std::find_if(text.begin(), text.end(), IsWhite);
     return text.substr(0, static_cast<std::size_t>(end - text.begin()));
 }
 
@@ -301,7 +302,7 @@ void BlockReport::KeywordLine(std::size_t index, std::string_view keyword, std::
         m_known = m_end = true;
         if (!IsBlank(rest))
             AfterEnd();
-    } else if (std::ranges::any_of(keyword, IsWhite)) {
+    } else if (std::any_of(keyword.begin(), keyword.end(), IsWhite)) {
         m_known = TabFollows(Line(index));
     }
 }
@@ -501,8 +502,8 @@ void BlockReport::Repeated(std::string_view keyword, std::string_view content, b
     if (m_otherBlock)
         return;
     const auto used = std::span(m_slots).first(m_slotsUsed);
-    const auto slot =
-        std::ranges::find_if(used, [&](const Slot& s) { return EqualsNoCase(keyword, s.keyword); });
+    const auto slot = std::find_if(used.begin(), used.end(),
+                                   [&](const Slot& s) { return EqualsNoCase(keyword, s.keyword); });
     if (slot == used.end()) {
         if (!empty && m_slotsUsed < m_slots.size())
             m_slots[m_slotsUsed++] = {keyword, content};
@@ -558,7 +559,7 @@ bool BlockReport::TakeText(std::string_view& text)
     const bool plain =
         close != m_texts.npos && (close + 1 == m_texts.size() || m_texts[close + 1] == ' ');
     if (!plain) {
-        if (std::ranges::count(m_texts, '"') % 2 != 0) {
+        if (std::count(m_texts.begin(), m_texts.end(), '"') % 2 != 0) {
             OpenQuote();
         } else {
             TextsAltered();

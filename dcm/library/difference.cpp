@@ -291,9 +291,9 @@ void JoinNear(const Points& oldPoints, const Points& newPoints, const Comparison
 
 bool AreSame(const Points& a, const Points& b, const Comparison& comparison)
 {
-    return std::ranges::equal(a, b, [&](const CComVariant& x, const CComVariant& y) {
-        return AreSame(x, y, comparison);
-    });
+    return std::equal(
+        a.begin(), a.end(), b.begin(), b.end(),
+        [&](const CComVariant& x, const CComVariant& y) { return AreSame(x, y, comparison); });
 }
 
 PointPairs PairsOf(const Points& oldPoints, const Points& newPoints, const Comparison& comparison)
@@ -567,7 +567,7 @@ std::vector<Difference> Differences(std::span<const Parameter> oldParameters,
     }
     std::vector<Difference> all;
     for (std::vector<Difference>& differences : byKind)
-        std::ranges::move(differences, std::back_inserter(all));
+        std::move(differences.begin(), differences.end(), std::back_inserter(all));
     return all;
 }
 

@@ -52,7 +52,7 @@ void PutTexts(Parameter& parameter, DCMBaseType& block)
 Kind KindOf(const CString& keyword, std::initializer_list<Kind> family)
 {
     const auto* const kind =
-        std::ranges::find_if(family, [&](Kind k) { return keyword == KeywordOf(k); });
+        std::find_if(family.begin(), family.end(), [&](Kind k) { return keyword == KeywordOf(k); });
     return kind == family.end() ? *family.begin() : *kind;
 }
 
@@ -80,7 +80,7 @@ std::vector<CComVariant> TakePoints(const PointArray& array)
 
 void PutPoints(std::vector<CComVariant>& points, const PointArray& array)
 {
-    std::ranges::for_each(points, MakePlain);
+    std::for_each(points.begin(), points.end(), MakePlain);
     array.points = std::move(points);
     SetTypeOfPoints(array);
 }
@@ -191,7 +191,8 @@ void Put(Parameter& parameter, DCMFestwerteblock& block)
     block.SetXValueCount(parameter.countX);
     block.SetYValueCount(parameter.countY);
     const ListFields fields = BlockIo::FieldsOf(block);
-    const auto texts = std::ranges::count(parameter.values, VT_BSTR, &CComVariant::vt);
+    const auto texts = std::count_if(parameter.values.begin(), parameter.values.end(),
+                                     [](const CComVariant& value) { return value.vt == VT_BSTR; });
     fields.numbers.reserve(parameter.values.size() - static_cast<std::size_t>(texts));
     for (const CComVariant& value : parameter.values) {
         if (value.vt == VT_BSTR) {
@@ -255,7 +256,9 @@ std::wstring_view KeywordOf(Kind kind) noexcept
 std::optional<Kind> KindOf(std::wstring_view keyword) noexcept
 {
     for (const Kind kind : kKinds) {
-        if (std::ranges::equal(keyword, KeywordOf(kind), {}, FoldCase, FoldCase))
+        const std::wstring_view own = KeywordOf(kind);
+        if (std::equal(keyword.begin(), keyword.end(), own.begin(), own.end(),
+                       [](wchar_t a, wchar_t b) { return FoldCase(a) == FoldCase(b); }))
             return kind;
     }
     return std::nullopt;

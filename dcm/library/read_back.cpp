@@ -121,7 +121,7 @@ std::vector<CComVariant> Chosen(const std::vector<CComVariant>& values,
                                 bool (*chosen)(const CComVariant&))
 {
     std::vector<CComVariant> result;
-    std::ranges::copy_if(values, std::back_inserter(result), chosen);
+    std::copy_if(values.begin(), values.end(), std::back_inserter(result), chosen);
     return result;
 }
 
@@ -405,7 +405,7 @@ private:
             return false;
         DocumentIo::DropBlocks(m_read);
         TextBuffer buffer(piece.size());
-        std::ranges::copy(piece, buffer.Data());
+        std::copy(piece.begin(), piece.end(), buffer.Data());
         buffer.EndAt(piece.size());
         const FileText text = FileText::OfFile(std::move(buffer));
         m_report.BeginText(text, m_line);

@@ -187,7 +187,7 @@ Report::~Report() = default;
 
 const std::vector<Finding>& Report::Findings() const noexcept
 {
-    static constinit const std::vector<Finding> none;
+    static const std::vector<Finding> none;
     return m_content ? m_content->findings.All() : none;
 }
 
@@ -198,7 +198,7 @@ std::size_t Report::Count(Severity severity) const noexcept
 
 std::size_t Report::Count(std::string_view id) const noexcept
 {
-    const auto* const found = std::ranges::lower_bound(kFindingIds, id);
+    const auto* const found = std::lower_bound(kFindingIds.begin(), kFindingIds.end(), id);
     if (!m_content || found == kFindingIds.end() || *found != id)
         return 0;
     return m_content->findings.CountOf(static_cast<FindingKind>(found - kFindingIds.begin()));

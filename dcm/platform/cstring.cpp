@@ -111,10 +111,12 @@ int CString::Compare(std::wstring_view other) const noexcept
 int CString::CompareNoCase(std::wstring_view other) const noexcept
 {
     const std::wstring_view own = View();
-    const auto order = std::lexicographical_compare_three_way(
-        own.begin(), own.end(), other.begin(), other.end(),
-        [](wchar_t a, wchar_t b) { return dcm::FoldCase(a) <=> dcm::FoldCase(b); });
-    return std::is_lt(order) ? -1 : std::is_gt(order) ? 1 : 0;
+    const auto [a, b] =
+        std::mismatch(own.begin(), own.end(), other.begin(), other.end(),
+                      [](wchar_t x, wchar_t y) { return dcm::FoldCase(x) == dcm::FoldCase(y); });
+    if (a == own.end() || b == other.end())
+        return (b == other.end() ? 1 : 0) - (a == own.end() ? 1 : 0);
+    return dcm::FoldCase(*a) < dcm::FoldCase(*b) ? -1 : 1;
 }
 
 int CString::Find(std::wstring_view text, int start) const noexcept

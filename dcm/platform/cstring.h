@@ -218,19 +218,19 @@ public:
     friend bool operator==(const CString& a, wchar_t b) noexcept { return a.View() == Whole(b); }
     friend std::strong_ordering operator<=>(const CString& a, const CString& b) noexcept
     {
-        return a.View() <=> b.View();
+        return a.View().compare(b.View()) <=> 0;
     }
     friend std::strong_ordering operator<=>(const CString& a, const wchar_t* b) noexcept
     {
-        return a.View() <=> Whole(b);
+        return a.View().compare(Whole(b)) <=> 0;
     }
     friend std::strong_ordering operator<=>(const CString& a, std::wstring_view b) noexcept
     {
-        return a.View() <=> b;
+        return a.View().compare(b) <=> 0;
     }
     friend std::strong_ordering operator<=>(const CString& a, wchar_t b) noexcept
     {
-        return a.View() <=> Whole(b);
+        return a.View().compare(Whole(b)) <=> 0;
     }
     /// Other numbers are not characters.
     template <dcm::NoCharacter Number>

@@ -21,7 +21,7 @@ FileText FileText::OfFile(TextBuffer content)
         origin = {true, HasTextAfterZero(bytes),
                   look.firstWide != bytes.npos && look.firstBad == bytes.npos};
         content = TextBuffer(utf8.size());
-        std::ranges::copy(utf8, content.Data());
+        std::copy(utf8.begin(), utf8.end(), content.Data());
         content.EndAt(utf8.size());
         encoding = Encoding::kUtf8;
     }
@@ -43,7 +43,7 @@ FileText FileText::OfHost(std::wstring_view text)
 bool HasTextAfterZero(std::string_view bytes)
 {
     bytes.remove_prefix(std::min(bytes.find('\0'), bytes.size()));
-    return std::ranges::any_of(bytes, [](char c) { return c != '\0' && !IsWhite(c); });
+    return std::any_of(bytes.begin(), bytes.end(), [](char c) { return c != '\0' && !IsWhite(c); });
 }
 
 HostBlock::HostBlock(std::wstring_view text) : m_text(FileText::OfHost(text))

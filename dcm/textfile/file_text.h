@@ -25,9 +25,7 @@ public:
     /// No bytes, and no memory for them.
     TextBuffer() = default;
     /// Memory for up to `room` bytes. `EndAt` must be called after they are written.
-    explicit TextBuffer(std::size_t room)
-        : m_bytes(std::make_unique_for_overwrite<char[]>(room + kReadAhead))
-    {}
+    explicit TextBuffer(std::size_t room) : m_bytes(new char[room + kReadAhead]) {}
 
     char* Data() { return m_bytes.get(); }
     /// Sets the number of bytes and writes the zeros after them.

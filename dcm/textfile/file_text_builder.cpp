@@ -50,8 +50,8 @@ void FileTextBuilder::MakeRoom(std::size_t room)
     // Doubling the capacity copies a text that grows piece by piece only a few times.
     constexpr std::size_t least = 4096;
     const std::size_t capacity = std::max({least, 2 * m_capacity, m_size + room});
-    auto bytes = std::make_unique_for_overwrite<char[]>(capacity);
-    std::ranges::copy(Bytes(), bytes.get());
+    std::unique_ptr<char[]> bytes(new char[capacity]);
+    std::copy_n(m_bytes.get(), m_size, bytes.get());
     m_bytes = std::move(bytes);
     m_capacity = capacity;
 }

@@ -74,14 +74,15 @@ static_assert(std::size(kKinds) == kFindingKinds);
 constexpr auto IdsOfKinds()
 {
     std::array<std::string_view, kFindingKinds> ids;
-    std::ranges::transform(kKinds, ids.begin(), [](const auto& kind) { return kind.id; });
+    std::transform(std::begin(kKinds), std::end(kKinds), ids.begin(),
+                   [](const auto& kind) { return kind.id; });
     return ids;
 }
 
 } // namespace
 
 constexpr std::array<std::string_view, kFindingKinds> kFindingIds = IdsOfKinds();
-static_assert(std::ranges::is_sorted(kFindingIds));
+static_assert(std::is_sorted(kFindingIds.begin(), kFindingIds.end()));
 
 Severity SeverityOf(FindingKind kind) noexcept
 {
@@ -104,8 +105,9 @@ void MessagePart::AppendTo(CString& message) const
                              : std::wstring(m_text->Wide(m_bytes.substr(0, 4 * kQuotedMax + 4)));
     const bool cut = shown.size() > kQuotedMax;
     shown.resize(std::min(shown.size(), kQuotedMax));
-    std::ranges::replace_if(
-        shown, [](wchar_t c) { return static_cast<std::uint32_t>(c) < 0x20 || c == 0x7F; }, L'.');
+    std::replace_if(
+        shown.begin(), shown.end(),
+        [](wchar_t c) { return static_cast<std::uint32_t>(c) < 0x20 || c == 0x7F; }, L'.');
     message.Append(L"\"").Append(shown).Append(cut ? L"...\"" : L"\"");
 }
 

@@ -52,9 +52,10 @@ void PravFile::LoadContent(UINT flags)
     if (status.m_size > kSizeMax)
         throw CFileException(CFileException::fileTooLarge, 0, FilePath());
     auto content = std::make_unique<Content>();
-    dcm::TextBuffer bytes(status.m_size);
-    dcm::system::ExpectToFill(bytes.Data(), status.m_size);
-    bytes.EndAt(Read(bytes.Data(), static_cast<UINT>(status.m_size)));
+    const auto size = static_cast<std::size_t>(status.m_size);
+    dcm::TextBuffer bytes(size);
+    dcm::system::ExpectToFill(bytes.Data(), size);
+    bytes.EndAt(Read(bytes.Data(), static_cast<UINT>(size)));
     content->m_strContent = dcm::FileText::OfFile(std::move(bytes));
     // A conversion to UTF-8 may lengthen the text.
     if (content->m_strContent.Bytes().size() > kSizeMax)

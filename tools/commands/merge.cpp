@@ -225,7 +225,8 @@ int Merge(const MergeOptions& options)
     for (const std::string& file : options.changes) {
         Input input = ReadForMerge(file, progress, options);
         leftOut.Add(input.report);
-        std::ranges::move(ParametersOf(std::move(input.document)), std::back_inserter(changes));
+        std::vector<Parameter> parameters = ParametersOf(std::move(input.document));
+        std::move(parameters.begin(), parameters.end(), std::back_inserter(changes));
     }
 
     Merged merged(ParametersOf(std::move(base.document)), options.force);

@@ -57,7 +57,7 @@ int MakeReport(const ReportOptions& options)
         const Source other = Read(options.other, progress);
         WritePage(page, file.Page(), other.Page(), Differences(file.parameters, other.parameters));
     }
-    WriteWholeFile(options.out, page.view());
+    WriteWholeFile(options.out, page.str());
     return 0;
 }
 

@@ -19,7 +19,9 @@ constexpr struct
 
 Look LookOf(Kind kind)
 {
-    return std::ranges::find(kOrder, kind, [](const auto& row) { return row.kind; })->look;
+    return std::find_if(std::begin(kOrder), std::end(kOrder),
+                        [&](const auto& row) { return row.kind == kind; })
+        ->look;
 }
 
 } // namespace
@@ -38,7 +40,9 @@ std::vector<PageKind> PageKindsOf(std::span<const Parameter> parameters,
     for (const auto& [kind, look] : kOrder)
         kinds.push_back({kind, look, {}});
     const auto blocksOf = [&](Kind kind) -> std::vector<PageBlock>& {
-        return std::ranges::find(kinds, kind, &PageKind::kind)->blocks;
+        return std::find_if(kinds.begin(), kinds.end(),
+                            [&](const PageKind& k) { return k.kind == kind; })
+            ->blocks;
     };
     for (std::size_t i = 0; i < parameters.size(); ++i) {
         const Difference* difference = differenceOf[i];
