@@ -183,6 +183,9 @@ TEST(Differences, CompareValuesAtEqualPoints)
         // Values beyond the axis.
         {"KENNLINIE a 1;ST/X 1;WERT 1 2;;", "KENNLINIE a 2;ST/X 0 1;WERT 0 1 3;;",
          "~ KENNLINIE a 0>0 X '1'>'2' x->0 [0]>0 w1>2 2>3 w->0 [0]>0\n"},
+        {"KENNFELD a 2 2;ST/X 1 2;ST/Y 1 2;WERT 1 2 3 4 5;;",
+         "KENNFELD a 3 2;ST/X 1 2 3;ST/Y 1 2;WERT 1 2 0 3 4 0 6;;",
+         "~ KENNFELD a 0>0 x->2 [0]>3 w4>6 5>6 w->2 [0]>0 w->5 [0]>0\n"},
         // A tolerance makes points equal, on a falling axis as well.
         {"KENNLINIE a 2;ST/X 1 2;WERT 10 20;;", "KENNLINIE a 3;ST/X 0 1.01 2.01;WERT 0 10 20;;",
          "~ KENNLINIE a 0>0 x->0 [0]>0 w->0 [0]>0\n", Absolute(0.1)},

@@ -76,6 +76,7 @@ TEST(Parameter, HasAKindOfItsKeyword)
     for (const Kind kind : dcm::kKinds)
         EXPECT_EQ(dcm::KindOf(dcm::KeywordOf(kind)), kind);
     EXPECT_EQ(dcm::KeywordOf(Kind::kGruppenkennfeld), L"GRUPPENKENNFELD");
+    EXPECT_EQ(dcm::KeywordOf(static_cast<Kind>(std::size(dcm::kKinds))), L"");
     EXPECT_EQ(dcm::KindOf(L"fESTWERTEBLOCK"), Kind::kFestwerteblock);
     for (const wchar_t* const word : {L"", L"FESTWERTE", L"FESTWER", L"FUNKTIONEN", L"*SSTX"})
         EXPECT_FALSE(dcm::KindOf(word)) << dcm::ToUtf8(word);
