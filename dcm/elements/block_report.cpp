@@ -166,7 +166,7 @@ void BlockReport::Version(const FileBlock& block)
     for (std::size_t i = 1; i < block.LineCount(); ++i) {
         m_line = block.LineNumber(i);
         const std::string_view line = TrimWhite(Line(i));
-        if (LookForKind(i) || line.empty() || EqualsNoCase(line, keyword::kEnd))
+        if (LookForKind(i) || m_otherBlock || line.empty() || EqualsNoCase(line, keyword::kEnd))
             continue;
         if (line.starts_with('*')) {
             DroppedComment(line);
