@@ -20,6 +20,20 @@ namespace dcm {
 
 namespace {
 
+/// The keywords of the fields, in their order.
+constexpr std::wstring_view kFieldKeywords[] = {
+    keyword::kLangname,
+    keyword::kDisplayname,
+    keyword::kFunktion,
+    keyword::kEinheitW,
+    keyword::kEinheitX,
+    keyword::kEinheitY,
+    keyword::kSstX,
+    keyword::kSstY,
+    L"X",
+    L"Y",
+};
+
 using Points = std::vector<CComVariant>;
 using Indices = std::vector<std::size_t>;
 
@@ -502,29 +516,8 @@ void ComparePointsAndValues(const Parameter& a, const Parameter& b, const Compar
 
 std::wstring_view KeywordOf(Field field) noexcept
 {
-    switch (field) {
-    case Field::kLangname:
-        return keyword::kLangname;
-    case Field::kDisplayname:
-        return keyword::kDisplayname;
-    case Field::kFunction:
-        return keyword::kFunktion;
-    case Field::kUnit:
-        return keyword::kEinheitW;
-    case Field::kUnitX:
-        return keyword::kEinheitX;
-    case Field::kUnitY:
-        return keyword::kEinheitY;
-    case Field::kDistributionX:
-        return keyword::kSstX;
-    case Field::kDistributionY:
-        return keyword::kSstY;
-    case Field::kCountX:
-        return L"X";
-    case Field::kCountY:
-        return L"Y";
-    }
-    return {};
+    const auto index = static_cast<std::size_t>(field);
+    return index < std::size(kFieldKeywords) ? kFieldKeywords[index] : std::wstring_view();
 }
 
 std::vector<Difference> Differences(std::span<const Parameter> oldParameters,

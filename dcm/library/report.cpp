@@ -10,6 +10,7 @@
 #include "dcm/textfile/findings.h"
 
 #include <algorithm>
+#include <iterator>
 #include <new>
 #include <numeric>
 #include <string>
@@ -51,41 +52,20 @@ enum class Direction : unsigned char
     kExport,
 };
 
-std::wstring_view NameOf(CFileException::Cause cause)
-{
-    switch (cause) {
-    case CFileException::none:
-        return L"none";
-    case CFileException::generic:
-        return L"generic";
-    case CFileException::fileNotFound:
-        return L"fileNotFound";
-    case CFileException::badPath:
-        return L"badPath";
-    case CFileException::tooManyOpenFiles:
-        return L"tooManyOpenFiles";
-    case CFileException::accessDenied:
-        return L"accessDenied";
-    case CFileException::invalidFile:
-        return L"invalidFile";
-    case CFileException::hardIO:
-        return L"hardIO";
-    case CFileException::sharingViolation:
-        return L"sharingViolation";
-    case CFileException::diskFull:
-        return L"diskFull";
-    case CFileException::fileTooLarge:
-        return L"fileTooLarge";
-    }
-    return L"generic";
-}
+/// The names of the causes, in their order.
+constexpr std::wstring_view kCauseNames[] = {
+    L"none",         L"generic",     L"fileNotFound", L"badPath",          L"tooManyOpenFiles",
+    L"accessDenied", L"invalidFile", L"hardIO",       L"sharingViolation", L"diskFull",
+    L"fileTooLarge",
+};
+static_assert(std::size(kCauseNames) == CFileException::fileTooLarge + 1);
 
 /// What the system says of a failure, with its cause by name.
 CString WordsOf(const CFileException& error) noexcept
 {
     try {
         CString words(L" (");
-        words.Append(NameOf(error.m_cause)).Append(L"): ");
+        words.Append(kCauseNames[error.m_cause]).Append(L"): ");
         return words.Append(FromUtf8(error.what())).Append(L".");
     } catch (const std::bad_alloc&) {
         return {};
@@ -128,10 +108,7 @@ HRESULT Run(FindingList& findings, Direction direction, Work work) noexcept
         if (findings.CountOf(FindingKind::kOutOfMemory) == 0)
             findings.Add(FindingKind::kOutOfMemory, Severity::kError, 0, {}, {L"Memory ran out."});
     } catch (...) {
-        if (findings.CountOf(FindingKind::kStopped) == 0) {
-            findings.Add(FindingKind::kStopped, Severity::kError, 0, {},
-                         {L"The work ended early."});
-        }
+        // Nothing else is raised but by the reader of a block, which was reported with its line.
     }
     return E_UNEXPECTED;
 }
