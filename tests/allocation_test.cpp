@@ -91,10 +91,14 @@ TEST(Allocation, FailureIsTheResultOfImportAndExport)
 TEST(Allocation, FailureOfAReportLeavesTheWorkAsItIs)
 {
     const Folder folder;
-    const CString in = folder / L"in", out = folder / L"out", plain = folder / L"plain";
-    WriteBytes(in, ReadBytes(CString(DCM_ALL_KINDS)) + "FESTWERT A\n WERT 720,5\nEND\n\n");
+    const CString in = folder / L"in", out = folder / L"out", plain = folder / L"plain",
+                  none = folder / L"none";
+    WriteBytes(in, ReadBytes(CString(DCM_ALL_KINDS)) +
+                       "FESTWERT A\n VAR a=b\n WERT 720,5\nEND\n\n"
+                       "KENNLINIE A 1\n*SSTX B\n ST/X 1\n WERT 1\nEND\n\n");
     DCMConverter all;
-    ASSERT_EQ(all.Import(in), S_OK);
+    dcm::Report unhindered;
+    ASSERT_EQ(dcm::Import(all, in, unhindered), S_OK);
     const std::string content = ExportBytes(all, plain);
     bool failed = true, told = false;
     for (long number = 1; failed; ++number) {
@@ -111,11 +115,12 @@ TEST(Allocation, FailureOfAReportLeavesTheWorkAsItIs)
         // Sorting can do without the memory that it asks for.
         const bool whole = result == S_OK && !report.Incomplete();
         EXPECT_TRUE(failed || whole);
-        EXPECT_TRUE(!whole || report.Findings().size() == 1);
+        EXPECT_TRUE(!whole || report.Count() == unhindered.Count());
         EXPECT_GT(report.Count(dcm::Severity::kError), 0U);
         told = told || report.Count("out-of-memory") == 1;
     }
     EXPECT_TRUE(told);
+    ASSERT_EQ(dcm::Export(all, out, unhindered), S_OK);
     failed = true;
     for (long number = 1; failed; ++number) {
         SCOPED_TRACE(number);
@@ -127,7 +132,19 @@ TEST(Allocation, FailureOfAReportLeavesTheWorkAsItIs)
         if (result == S_OK) {
             EXPECT_EQ(ReadBytes(out), content);
         }
-        EXPECT_EQ(failed, result != S_OK || report.Incomplete());
+        const bool whole = result == S_OK && !report.Incomplete();
+        EXPECT_TRUE(failed || whole);
+        EXPECT_TRUE(!whole || report.Count() == unhindered.Count());
+    }
+    failed = true;
+    for (long number = 1; failed; ++number) {
+        DCMConverter document;
+        dcm::Report report;
+        untilFailure = number;
+        EXPECT_EQ(dcm::Import(document, none, report), E_UNEXPECTED);
+        failed = untilFailure <= 0;
+        untilFailure = 0;
+        EXPECT_EQ(report.Count(dcm::Severity::kError), 1U);
     }
 }
 

@@ -22,7 +22,54 @@ VARIANT Tagged(VARTYPE tag, std::int64_t content = 0)
     return variant;
 }
 
+/// The private members that read and compose lines.
+auto PrivateMembers();
+
+/// An explicit instantiation may name private members.
+template <auto... Members>
+struct PrivateMember
+{
+    friend auto PrivateMembers() { return std::tuple(Members...); }
+};
+
+template struct PrivateMember<&DCMFestwerteblock::AddValues, &DCMFestwerteblock::AddStringValues,
+                              &DCMFestwerteblock::ExportValues,
+                              &DCMStuetzstellenverteilung::AddValues,
+                              &DCMStuetzstellenverteilung::ExportValues, &DCMKennlinie::AddValues,
+                              &DCMKennlinie::ExportValues>;
+
 } // namespace
+
+TEST(Blocks, ReadAndComposeTheirLines)
+{
+    const auto [addToList, addTexts, listLines, addPoints, pointLines, addToCurve, curveLines] =
+        PrivateMembers();
+    PravFile file;
+    CString numbers(L"1 x"), texts(L"\"a\" \"b\""), unquoted(L"c"), none;
+    DCMFestwerteblock list;
+    EXPECT_EQ((list.*addToList)(texts), S_OK);
+    EXPECT_EQ((list.*addTexts)(unquoted), S_OK);
+    EXPECT_EQ((list.*listLines)(file), L"    TEXT \"a\"    \"b\"   \n");
+    list.AddValue(0.1);
+    EXPECT_EQ((list.*addToList)(numbers), S_OK);
+    EXPECT_EQ((list.*listLines)(file), L"    WERT 0.10000000000000001    1.0    0.0   \n");
+    list.SetXValueCount(2);
+    list.SetYValueCount(1);
+    EXPECT_EQ((list.*listLines)(file), L"    WERT 0.1    1.0   \n    WERT 0.0   \n");
+    EXPECT_THROW((list.*addToList)(none), dcm::ResultError);
+    EXPECT_EQ(numbers + texts + unquoted, L"") << "what is read is taken";
+
+    CString points(L"1 2"), more(L"\"a\""), values(L"3"), dropped(L"4");
+    DCMStuetzstellenverteilung distribution;
+    EXPECT_EQ((distribution.*addPoints)(points), S_OK);
+    EXPECT_EQ((distribution.*pointLines)(file), L"    ST/X 1.0    2.0   \n");
+    DCMKennlinie curve;
+    EXPECT_EQ((curve.*addToCurve)(more, L"ST_TX/X"), S_OK);
+    EXPECT_EQ((curve.*addToCurve)(values, L"wert"), S_OK);
+    EXPECT_EQ((curve.*addToCurve)(dropped, L"TEXT"), S_OK);
+    EXPECT_EQ((curve.*curveLines)(file), L"    ST_TX/X \"a\" \n    WERT 3.0   \n");
+    EXPECT_EQ(points + more + values + dropped, L"");
+}
 
 TEST(Blocks, WriteWhatTheHostSets)
 {

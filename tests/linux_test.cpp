@@ -206,6 +206,9 @@ TEST(FileFault, OfEachCallIsReported)
         EXPECT_EQ(ExportBytes(document), whole ? bytes : none);
         EXPECT_TRUE(met);
     }
+    dcm::Report report;
+    EXPECT_TRUE(Under({"fstat", 2, EIO}, [&] { dcm::Export(source, path, report); }));
+    EXPECT_EQ(report.Count("cannot-write"), 1U);
 }
 
 TEST(FileFault, HasACauseANumberAndWords)

@@ -434,7 +434,10 @@ TEST(Report, IsEmptiedByTheNextCall)
     EXPECT_TRUE(report.Incomplete() && report.Findings().empty());
     dcm::Report moved = std::move(report);
     EXPECT_EQ(report.Summary(), L"no findings");
-    EXPECT_EQ(dcm::Report(moved).Count(dcm::Severity::kError), 1U);
+    dcm::Report copy;
+    copy = moved;
+    EXPECT_EQ(copy.Count(dcm::Severity::kError), 1U);
+    EXPECT_EQ(dcm::Report(report).Count(), 0U) << "a report without content";
     EXPECT_EQ(dcm::Export(document, dcm::NullDevice(), moved), S_OK);
     EXPECT_EQ(moved.Summary(), L"no findings");
     EXPECT_EQ(moved.Count() + moved.Limit(), 0U);
