@@ -370,12 +370,16 @@ TEST(Report, SaysWhyAFileCannotBeUsed)
         const char* import;
         const char* export_;
         const wchar_t* words;
+        CFileException::Cause cause;
     } cases[] = {
-        {folder / L"none" + CString(L"/none"), "cannot-open", "cannot-open", L""},
-        {folder / L"", "cannot-open", "cannot-open", L"("},
-        {file, "cannot-open", "cannot-open", L"(sharingViolation): "},
-        {large, "cannot-open", "", L"(fileTooLarge): "},
-        {L"/dev/full", "", "cannot-write", L"(diskFull): "},
+        {folder / L"none" + CString(L"/none"), "cannot-open", "cannot-open", L"",
+         CFileException::fileNotFound},
+        {folder / L"", "cannot-open", "cannot-open", L"(accessDenied): ",
+         CFileException::accessDenied},
+        {file, "cannot-open", "cannot-open", L"(sharingViolation): ",
+         CFileException::sharingViolation},
+        {large, "cannot-open", "", L"(fileTooLarge): ", CFileException::fileTooLarge},
+        {L"/dev/full", "", "cannot-write", L"(diskFull): ", CFileException::diskFull},
     };
     for (const auto& c : cases) {
         SCOPED_TRACE(dcm::ToUtf8(c.path));
@@ -384,6 +388,7 @@ TEST(Report, SaysWhyAFileCannotBeUsed)
         const auto check = [&](HRESULT result, const char* id) {
             EXPECT_EQ(result, E_UNEXPECTED);
             EXPECT_EQ(Listed(report), "0 error " + std::string(id) + "\n");
+            EXPECT_EQ(report.Cause(), c.cause);
             EXPECT_NE(report.Findings().at(0).message.View().find(c.words),
                       std::wstring_view::npos);
         };
@@ -434,12 +439,16 @@ TEST(Report, IsEmptiedByTheNextCall)
     EXPECT_TRUE(report.Incomplete() && report.Findings().empty());
     dcm::Report moved = std::move(report);
     EXPECT_EQ(report.Summary(), L"no findings");
+    EXPECT_EQ(report.Cause(), CFileException::none);
     dcm::Report copy;
     copy = moved;
     EXPECT_EQ(copy.Count(dcm::Severity::kError), 1U);
+    EXPECT_EQ(copy.Cause(), CFileException::fileNotFound);
+    EXPECT_NE(copy.SystemError(), 0);
     EXPECT_EQ(dcm::Report(report).Count(), 0U) << "a report without content";
     EXPECT_EQ(dcm::Export(document, dcm::NullDevice(), moved), S_OK);
     EXPECT_EQ(moved.Summary(), L"no findings");
+    EXPECT_TRUE(moved.Cause() == CFileException::none && moved.SystemError() == 0);
     EXPECT_EQ(moved.Count() + moved.Limit(), 0U);
     EXPECT_FALSE(moved.Incomplete());
 }

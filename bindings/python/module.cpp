@@ -6,6 +6,7 @@
 
 #include <pybind11/pybind11.h>
 
+#include <cerrno>
 #include <cstddef>
 #include <memory>
 #include <string>
@@ -65,6 +66,26 @@ std::vector<Parameter> GivenAll(const py::list& items)
     return parameters;
 }
 
+/// The system's number of the error by which the file failed; 0 when it did not.
+int ErrorNumber(const Report& report)
+{
+    if (report.Cause() == CFileException::none)
+        return 0;
+    if (report.SystemError() != 0)
+        return static_cast<int>(report.SystemError());
+    // The library's own refusals.
+    switch (report.Cause()) {
+    case CFileException::sharingViolation:
+        return EWOULDBLOCK;
+    case CFileException::fileTooLarge:
+        return EFBIG;
+    case CFileException::accessDenied:
+        return EACCES;
+    default:
+        return EIO;
+    }
+}
+
 py::tuple Read(const std::string& path, unsigned codePage)
 {
     auto document = std::make_unique<Document>();
@@ -78,7 +99,8 @@ py::tuple Read(const std::string& path, unsigned codePage)
         document->comment = file.GetComment();
         document->parameters = ParametersOf(std::move(file));
     }
-    return py::make_tuple(SUCCEEDED(result), std::move(document), ToPython(report));
+    return py::make_tuple(SUCCEEDED(result), ErrorNumber(report), std::move(document),
+                          ToPython(report));
 }
 
 py::tuple Write(const std::string& path, unsigned codePage, const std::wstring& comment,
@@ -97,7 +119,7 @@ py::tuple Write(const std::string& path, unsigned codePage, const std::wstring& 
         result =
             toNullDevice ? Export(file, NullDevice(), report) : Save(file, FromUtf8(path), report);
     }
-    return py::make_tuple(SUCCEEDED(result), ToPython(report));
+    return py::make_tuple(SUCCEEDED(result), ErrorNumber(report), ToPython(report));
 }
 
 py::list Diff(const py::list& oldItems, const py::list& newItems, double absolute, double relative,

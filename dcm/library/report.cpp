@@ -31,6 +31,14 @@ struct ReportAccess
         report.m_content.reset();
         report.m_counts = {};
         report.m_incomplete = false;
+        report.m_cause = CFileException::none;
+        report.m_systemError = 0;
+    }
+
+    static void SetFailure(Report& report, const CFileException& error) noexcept
+    {
+        report.m_cause = error.m_cause;
+        report.m_systemError = error.m_lOsError;
     }
 
     /// The findings become the report's content. Without memory for them, only their counts do.
@@ -72,9 +80,10 @@ CString WordsOf(const CFileException& error) noexcept
     }
 }
 
-void AddFileFailure(FindingList& findings, FileStage stage, Direction direction,
+void AddFileFailure(Report& report, FindingList& findings, FileStage stage, Direction direction,
                     const CFileException& error) noexcept
 {
+    ReportAccess::SetFailure(report, error);
     const auto add = [&](FindingKind kind, std::wstring_view what) {
         findings.Add(kind, Severity::kError, 0, {}, {what, WordsOf(error)});
     };
@@ -93,24 +102,28 @@ CFileException NoAnswer(const CString& path)
     return {CFileException::generic, 0, path};
 }
 
-/// Runs an import or export and reports the failure that ends it, unless that was done where it
-/// happened.
+/// Empties the report, runs an import or export and reports its findings and the failure that ended
+/// it, unless that was done where it happened.
 template <class Work>
-HRESULT Run(FindingList& findings, Direction direction, Work work) noexcept
+HRESULT Run(Report& report, Direction direction, Work work) noexcept
 {
+    ReportAccess::Empty(report);
+    FindingList findings(report.Limit());
     auto stage = FileStage::kOpening;
+    HRESULT result = E_UNEXPECTED;
     try {
-        work(stage);
-        return S_OK;
+        work(stage, findings);
+        result = S_OK;
     } catch (const CFileException& error) {
-        AddFileFailure(findings, stage, direction, error);
+        AddFileFailure(report, findings, stage, direction, error);
     } catch (const std::bad_alloc&) {
         if (findings.CountOf(FindingKind::kOutOfMemory) == 0)
             findings.Add(FindingKind::kOutOfMemory, Severity::kError, 0, {}, {L"Memory ran out."});
     } catch (...) {
         // Nothing else is raised but by the reader of a block, which was reported with its line.
     }
-    return E_UNEXPECTED;
+    ReportAccess::Set(report, std::move(findings));
+    return result;
 }
 
 } // namespace
@@ -137,7 +150,8 @@ Report::Report() noexcept = default;
 
 Report::Report(const Report& other)
     : m_content(other.m_content ? std::make_unique<Content>(*other.m_content) : nullptr),
-      m_counts(other.m_counts), m_limit(other.m_limit), m_incomplete(other.m_incomplete)
+      m_counts(other.m_counts), m_limit(other.m_limit), m_incomplete(other.m_incomplete),
+      m_cause(other.m_cause), m_systemError(other.m_systemError)
 {}
 
 Report::Report(Report&& other) noexcept : Report()
@@ -157,6 +171,8 @@ Report& Report::operator=(Report&& other) noexcept
     m_counts = std::exchange(other.m_counts, {});
     m_limit = other.m_limit;
     m_incomplete = std::exchange(other.m_incomplete, false);
+    m_cause = std::exchange(other.m_cause, CFileException::none);
+    m_systemError = std::exchange(other.m_systemError, 0);
     return *this;
 }
 
@@ -214,35 +230,35 @@ bool Report::Incomplete() const noexcept
     return m_incomplete;
 }
 
+CFileException::Cause Report::Cause() const noexcept
+{
+    return m_cause;
+}
+
+long Report::SystemError() const noexcept
+{
+    return m_systemError;
+}
+
 HRESULT Import(DCMConverter& document, const CString& path, Report& report)
 {
-    ReportAccess::Empty(report);
-    FindingList findings(report.Limit());
-    ImportReport blocks(findings);
-    const HRESULT result = Run(findings, Direction::kImport, [&](FileStage& stage) {
+    return Run(report, Direction::kImport, [&](FileStage& stage, FindingList& findings) {
+        ImportReport blocks(findings);
         DocumentIo::Import(document, path, stage, &blocks);
     });
-    ReportAccess::Set(report, std::move(findings));
-    return result;
 }
 
 HRESULT Export(const DCMConverter& document, const CString& path, Report& report)
 {
-    ReportAccess::Empty(report);
-    FindingList findings(report.Limit());
-    const HRESULT result = Run(findings, Direction::kExport, [&](FileStage& stage) {
+    return Run(report, Direction::kExport, [&](FileStage& stage, FindingList& findings) {
         if (!ExportAndReadBack(document, path, stage, findings))
-            AddFileFailure(findings, stage, Direction::kExport, NoAnswer(path));
+            AddFileFailure(report, findings, stage, Direction::kExport, NoAnswer(path));
     });
-    ReportAccess::Set(report, std::move(findings));
-    return result;
 }
 
 HRESULT Save(const DCMConverter& document, const CString& path, Report& report)
 {
-    ReportAccess::Empty(report);
-    FindingList findings(report.Limit());
-    const HRESULT result = Run(findings, Direction::kExport, [&](FileStage& stage) {
+    return Run(report, Direction::kExport, [&](FileStage& stage, FindingList& findings) {
         ReplacementFile file(path);
         try {
             if (!ExportAndReadBack(document, file.Path(), stage, findings))
@@ -252,8 +268,6 @@ HRESULT Save(const DCMConverter& document, const CString& path, Report& report)
         }
         file.TakePlace();
     });
-    ReportAccess::Set(report, std::move(findings));
-    return result;
 }
 
 CString NullDevice()

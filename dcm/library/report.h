@@ -2,6 +2,7 @@
 
 #include "dcm/library/export.h"
 #include "dcm/platform/automation.h"
+#include "dcm/platform/cfile.h"
 #include "dcm/platform/cstring.h"
 #include "dcm/textfile/finding.h"
 
@@ -56,6 +57,12 @@ public:
     /// Whether findings are missing from the list: an id met its limit, or memory ran out.
     bool Incomplete() const noexcept;
 
+    /// Why the file could not be opened, read or written; `CFileException::none` when it could, or
+    /// when something else ended the work. After `sharingViolation` try again later.
+    CFileException::Cause Cause() const noexcept;
+    /// The system's own number of that error; 0 when the system reported none.
+    long SystemError() const noexcept;
+
 private:
     friend struct ReportAccess;
     struct Content;
@@ -65,6 +72,8 @@ private:
     std::array<std::size_t, 3> m_counts{};
     std::size_t m_limit = 1000;
     bool m_incomplete = false;
+    CFileException::Cause m_cause = CFileException::none;
+    long m_systemError = 0;
 };
 
 /// Does what `document.Import(path)` does, with the same result, and reports all that the file

@@ -390,6 +390,8 @@ void Reports()
     Take(&dcm::Report::SetLimit);
     Take(&dcm::Report::Limit);
     Take(&dcm::Report::Incomplete);
+    Take(&dcm::Report::Cause);
+    Take(&dcm::Report::SystemError);
     Take(&dcm::NameOf);
     Take(&dcm::FindingIds);
     Take(&dcm::Import);

@@ -182,12 +182,12 @@ class Calibration(Mapping[str, Parameter]):
         report = Report()
         for to_null_device in (True, False) if strict else (False,):
             try:
-                written, found = _dcm.write(text, page, self.comment, plain, to_null_device)
+                written, number, found = _dcm.write(text, page, self.comment, plain, to_null_device)
             except KeyError:
                 raise unknown(encoding) from None
             report = Report(found)
             if not written:
-                raise file_error(text, report, WriteError)
+                raise file_error(text, number, report, WriteError)
             doubt = _first_doubt(report, strict)
             if doubt:
                 raise WriteError(text, doubt, report)
@@ -263,12 +263,12 @@ def read(
     """
     text = _path(path)
     try:
-        complete, document, found = _dcm.read(text, code_page(encoding))
+        complete, number, document, found = _dcm.read(text, code_page(encoding))
     except KeyError:
         raise unknown(encoding) from None
     report = Report(found)
     if not complete:
-        raise file_error(text, report, ReadError)
+        raise file_error(text, number, report, ReadError)
     doubt = _first_doubt(report, strict)
     if doubt:
         raise ReadError(text, doubt, report)

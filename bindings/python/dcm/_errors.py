@@ -4,20 +4,8 @@ from __future__ import annotations
 
 import errno
 import os
-import re
 
 from dcm._report import Finding, Report, Severity
-
-#: The system's errors by the name of the cause that a finding has in parentheses.
-_ERRNO = {
-    "fileNotFound": errno.ENOENT,
-    "badPath": errno.ENOTDIR,
-    "tooManyOpenFiles": errno.EMFILE,
-    "accessDenied": errno.EACCES,
-    "sharingViolation": errno.EWOULDBLOCK,
-    "diskFull": errno.ENOSPC,
-    "fileTooLarge": errno.EFBIG,
-}
 
 
 class _FileError(Exception):
@@ -45,15 +33,13 @@ class WriteError(_FileError):
     """With `strict`: a calibration of which the file would not keep all."""
 
 
-def file_error(path: str, report: Report, strict: type[_FileError]) -> Exception:
-    """The error for an import or export that has failed."""
+def file_error(path: str, number: int, report: Report, strict: type[_FileError]) -> Exception:
+    """The error for an import or export that has failed, by `number` of the system or without."""
     finding = report.first(Severity.ERROR)
     if finding is None or finding.id == "out-of-memory":
         return MemoryError(path)
-    if finding.id not in ("cannot-open", "cannot-read", "cannot-write"):
+    if not number:
         return strict(path, next(f for f in reversed(report) if f.severity is Severity.ERROR), report)
-    cause = re.search(r"\((\w+)\):", finding.message)
-    number = _ERRNO.get(cause[1] if cause else "", errno.EIO)
     if number == errno.EACCES and os.path.isdir(path):
         number = errno.EISDIR
     return OSError(number, os.strerror(number), path)
