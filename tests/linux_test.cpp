@@ -368,6 +368,13 @@ TEST(LinuxFile, IsNotInheritedAndMayHaveAnyHandle)
     EXPECT_EQ(file.GetLength(), 1U);
     file.Close();
     EXPECT_EQ(fcntl(STDIN_FILENO, F_GETFD), -1);
+    const DCMConverter document;
+    for (const wchar_t* const name : {L"new", L"file"}) {
+        dcm::Report report;
+        EXPECT_EQ(dcm::Save(document, folder / name, report), S_OK);
+        EXPECT_EQ(ReadBytes(folder / name), ExportBytes(document));
+        EXPECT_EQ(fcntl(STDIN_FILENO, F_GETFD), -1) << dcm::ToUtf8(name);
+    }
     dup2(input, STDIN_FILENO);
     close(input);
 }
