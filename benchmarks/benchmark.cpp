@@ -11,6 +11,7 @@
 #include <fstream>
 #include <iostream>
 #include <iterator>
+#include <limits>
 #include <map>
 #include <stdexcept>
 #include <string>
@@ -69,7 +70,7 @@ void Check(const Stage& stage, const Contestant& contestant, std::string& export
     const Outcome outcome = contestant.run(stage);
     if (contestant.name.starts_with("import/") && outcome.checksum != stage.data.checksum)
         throw std::runtime_error(contestant.name + " reads other numbers");
-    if (contestant.name == "export/dcm" || contestant.name == "export/floor" ||
+    if (contestant.name == "export/dcm" || contestant.name.starts_with("export/floor") ||
         contestant.name == "export/snprintf") {
         std::string text = FileText(stage.outputFile);
         if (exported.empty()) {
@@ -116,13 +117,22 @@ private:
     std::map<std::string, std::vector<double>> m_times;
 };
 
-void Register(const Stage& stage, const Contestant& contestant, const std::string& name)
+/// Where a contestant gets its memory from.
+enum class Heap
+{
+    /// From the system, as in a process that does the work once.
+    kCold,
+    /// From what those before it have released, as in a process that does it again and again.
+    kWarm,
+};
+
+void Register(const Stage& stage, const Contestant& contestant, const std::string& name, Heap heap)
 {
     benchmark::RegisterBenchmark(name.c_str(),
-                                 [&stage, &contestant](benchmark::State& state) {
+                                 [&stage, &contestant, heap](benchmark::State& state) {
                                      for ([[maybe_unused]] auto _ : state) {
-                                         // Each gets its memory from the system.
-                                         malloc_trim(0);
+                                         if (heap == Heap::kCold)
+                                             malloc_trim(0);
                                          state.SetIterationTime(contestant.run(stage).seconds);
                                      }
                                      state.counters["numbers"] =
@@ -151,21 +161,29 @@ int Main(int argc, char** argv)
     const double factor = std::stod(Argument(argc, argv, "--factor", "1"));
     const int rounds = std::stoi(Argument(argc, argv, "--rounds", "15"));
     const std::string growth = Argument(argc, argv, "--growth", "");
+    const Heap heap = Argument(argc, argv, "--heap", "cold") == "warm" ? Heap::kWarm : Heap::kCold;
+    if (heap == Heap::kWarm) {
+        // Nothing is returned to the system.
+        mallopt(M_MMAP_MAX, 0);
+        mallopt(M_TRIM_THRESHOLD, std::numeric_limits<int>::max());
+    }
 
     const TemporaryFolder folder;
     Stage stage;
     SetUp(stage, folder.Path(), flavour, factor, true);
     std::string exported;
     for (const Contestant& contestant : Contestants()) {
+        if (heap == Heap::kWarm && !contestant.name.starts_with("import/"))
+            continue;
         Check(stage, contestant, exported);
-        Register(stage, contestant, contestant.name);
+        Register(stage, contestant, contestant.name, heap);
     }
     Stage large;
     if (!growth.empty()) {
         SetUp(large, folder.Path(), flavour, factor * std::stod(growth), false);
         for (const Contestant& contestant : Contestants()) {
             if (contestant.name == "import/dcm" || contestant.name == "export/dcm")
-                Register(large, contestant, contestant.name + "-large");
+                Register(large, contestant, contestant.name + "-large", heap);
         }
     }
     Collector collector;

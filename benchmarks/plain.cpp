@@ -111,8 +111,15 @@ void AppendNumber(std::string& text, double number)
         text.append(".0");
 }
 
+/// How much one call writes.
+enum class Calls
+{
+    kOneABlock,
+    kOne,
+};
+
 /// The lines of an exported file.
-template <Digits how>
+template <Digits how, Calls calls>
 class Writer
 {
 public:
@@ -120,14 +127,15 @@ public:
 
     void Write(const Data& data)
     {
-        m_text = "\r\n\r\n";
+        m_text.append("\r\n\r\n");
         Flush();
-        m_text = "KONSERVIERUNG_FORMAT 2.0\r\n\r\n";
+        m_text.append("KONSERVIERUNG_FORMAT 2.0\r\n\r\n");
         Flush();
         for (const Block& block : data.blocks) {
             Append(block);
             Flush();
         }
+        WriteText();
     }
 
 private:
@@ -199,6 +207,12 @@ private:
 
     void Flush()
     {
+        if constexpr (calls == Calls::kOneABlock)
+            WriteText();
+    }
+
+    void WriteText()
+    {
         if (std::fwrite(m_text.data(), 1, m_text.size(), m_file.get()) != m_text.size())
             throw std::runtime_error("cannot write");
         m_text.clear();
@@ -208,11 +222,11 @@ private:
     std::string m_text;
 };
 
-template <Digits how>
+template <Digits how, Calls calls>
 Outcome WritePlainly(const Stage& stage)
 {
     Outcome outcome;
-    Timed(outcome.seconds, [&] { Writer<how>(stage.outputFile).Write(stage.narrowData); });
+    Timed(outcome.seconds, [&] { Writer<how, calls>(stage.outputFile).Write(stage.narrowData); });
     return outcome;
 }
 
@@ -245,9 +259,12 @@ const TakesPart kFromChars("token/from_chars", [](const Stage& stage) {
     return outcome;
 });
 
-const TakesPart kWriteFloor("export/floor", WritePlainly<Digits::kToChars>);
+const TakesPart kWriteFloor("export/floor", WritePlainly<Digits::kToChars, Calls::kOneABlock>);
 
-const TakesPart kWriteNaively("export/snprintf", WritePlainly<Digits::kSnprintf>);
+const TakesPart kWriteAtOnce("export/floor-at-once", WritePlainly<Digits::kToChars, Calls::kOne>);
+
+const TakesPart kWriteNaively("export/snprintf",
+                              WritePlainly<Digits::kSnprintf, Calls::kOneABlock>);
 
 } // namespace
 

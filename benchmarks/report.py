@@ -19,12 +19,17 @@ LARGE = 8
 # The most bytes that a report may take for each block of a clean file.
 BLOCK_MEMORY = 64
 BLOCKS = 28800
+# On a quiet machine the rounds' times are this close to each other.
+QUIET = 0.05
 
 # What is measured, what it is compared with, the two figures, and the limits of their ratio, full and
 # short; None for no limit. A limit below 0 is a speed: "3.2 times as fast" is -3.2.
 ROWS = [
     ("import", "reading floor", "import/dcm", "import/floor", (1.0, 1.1)),
     ("import", "simdjson DOM, copied out", "import/dcm", "import/simdjson", (1.0, 0.9)),
+    ("import, warm heap", "reading floor", "warm/import/dcm", "warm/import/floor", (None, None)),
+    ("import, warm heap", "simdjson DOM, copied out", "warm/import/dcm", "warm/import/simdjson",
+     (0.9, 0.95)),
     ("import", "RapidJSON DOM, copied out", "import/dcm", "import/rapidjson", (0.55, 0.8)),
     ("import", "naive host", "import/dcm", "import/naive", (-3.2, -3.0)),
     ("import, instructions a number", "reading floor", "instructions/import", "instructions/floor",
@@ -39,7 +44,8 @@ ROWS = [
      "report/memory", "one", (1.0, 1.0)),
     ("first import of a process", "the first pass of the floor", "first/dcm", "first/floor",
      (None, None)),
-    ("export", "writing floor", "export/dcm", "export/floor", (0.5, 0.5)),
+    ("export", "writing floor, one write a block", "export/dcm", "export/floor", (0.5, 0.5)),
+    ("export", "the same in a single write", "export/dcm", "export/floor-at-once", (None, None)),
     ("export", "the same lines with `snprintf`", "export/dcm", "export/snprintf", (-6.0, -5.0)),
     ("export", "RapidJSON's writer", "export/dcm", "export/rapidjson", (None, None)),
     (f"export, ns a number at factor {LARGE}", "at factor 1", "export/dcm-large", "export/dcm",
@@ -47,6 +53,8 @@ ROWS = [
     ("number text", "`std::to_chars(general, 17)`", "text/dcm", "text/to_chars", (0.35, 0.4)),
     ("number text", "fmt `{:.17g}`", "text/dcm", "text/fmt", (0.35, 0.2)),
     ("number token", "`std::from_chars`", "token/dcm", "token/from_chars", (None, None)),
+    ("`dcm diff` of 100,800 blocks", "both imported, names paired", "diff", "one", (None, 1.2)),
+    ("all content by the C interface", "import", "c-interface", "one", (None, 0.3)),
     ("document copy", "the same payload", "copy/dcm", "copy/payload", (1.3, 1.3)),
 ] + [
     (f"Get of the {kind} list", "the same payload", f"get-{kind}/dcm", f"get-{kind}/payload",
@@ -66,6 +74,13 @@ def run(program, *arguments):
     """What a benchmark program prints, as JSON."""
     command = [BUILD / "benchmarks" / program, *map(str, arguments)]
     return json.loads(subprocess.run(command, check=True, stdout=subprocess.PIPE).stdout)
+
+
+def printed_ratio(program):
+    """The ratio that a program prints; its exit status is a failure when that is too high."""
+    text = subprocess.run([BUILD / "benchmarks" / program], stdout=subprocess.DEVNULL,
+                          stderr=subprocess.PIPE, text=True, check=False).stderr
+    return float(re.search(r"ratio\D*([\d.]+)", text).group(1))
 
 
 def measure_in_fresh_processes(flavour, rounds):
@@ -100,6 +115,10 @@ def measure(rounds):
         results[flavour] = run("dcm_benchmark", f"--flavour={flavour}", f"--rounds={rounds}",
                                f"--growth={LARGE}")
         results[flavour].update(measure_in_fresh_processes(flavour, rounds))
+        warm = run("dcm_benchmark", f"--flavour={flavour}", f"--rounds={rounds}", "--heap=warm")
+        results[flavour].update({"warm/" + name: times for name, times in warm.items()})
+    for name, program in (("diff", "dcm_diff"), ("c-interface", "dcm_c_interface")):
+        results["short"][name] = [printed_ratio(program)]
     for (what, flavour), figure in instructions.count_all((*instructions.KEPT, "report", "floor")).items():
         results[flavour]["instructions/" + what] = [figure]
     # Its exit status is a failure when a limit is exceeded; the table shows that too.
@@ -155,18 +174,47 @@ def processor():
     return match.group(1).strip() if match else "unknown"
 
 
+def spread(results):
+    """How far apart the middle half of the rounds' times are, as a share of their median: the median
+    of this for all imports and exports."""
+    shares = []
+    for figures in results.values():
+        for name, times in figures.items():
+            if name.startswith(("import/", "export/")) and len(times) > 3:
+                quarters = statistics.quantiles(times, n=4)
+                shares.append((quarters[2] - quarters[0]) / quarters[1])
+    return statistics.median(shares) if shares else 0
+
+
+def machine(results):
+    """The processor, and whether other work of the machine disturbed the measurement."""
+    share = spread(results)
+    state = "quiet" if share <= QUIET else "busy with other work"
+    return (f"Processor: {processor()}. The machine was {state}: the middle half of a contestant's "
+            f"rounds\nwas within {share:.0%} of their median.")
+
+
+def replace_section(figures, section):
+    """The figures of all processors with `section` in the place of the one with the same heading."""
+    sections = [part for part in re.split(r"(?=^### )", figures, flags=re.MULTILINE) if part.strip()]
+    heading = section.split("\n")[0]
+    kept = [part.rstrip() for part in sections if part.split("\n")[0] != heading]
+    return "\n\n".join([section, *kept]) + "\n"
+
+
 def write_page(results):
-    """Replaces the figures on the page, which are between two comments, and draws the chart."""
+    """Replaces this processor's figures on the page, which has those of each processor between two
+    comments, and draws the chart."""
     medians = {
         flavour: {name: statistics.median(values) for name, values in figures.items()}
         for flavour, figures in results.items()
     }
     CHART.parent.mkdir(parents=True, exist_ok=True)
     CHART.write_text(chart.draw(medians))
-    figures = f"{table(results)}\n\nProcessor: {processor()}.\n"
-    page = re.sub(r"(<!-- figures -->\n).*?(<!-- end of figures -->)",
-                  lambda marks: marks.group(1) + figures + marks.group(2),
-                  PAGE.read_text(), flags=re.DOTALL)
+    section = f"### {processor()}\n\n{table(results)}\n\n{machine(results)}"
+    page = re.sub(r"(<!-- figures -->\n)(.*?)(<!-- end of figures -->)",
+                  lambda marks: marks.group(1) + replace_section(marks.group(2), section) +
+                  marks.group(3), PAGE.read_text(), flags=re.DOTALL)
     PAGE.write_text(page)
 
 
@@ -178,6 +226,7 @@ def main():
     results = measure(arguments.rounds)
     (BUILD / "results.json").write_text(json.dumps(results, indent=1))
     print(table(results))
+    print(machine(results))
     if arguments.write:
         write_page(results)
 
