@@ -12,11 +12,16 @@ constinit thread_local std::size_t wanted = 0;
 
 bool LibraryLeaks()
 {
+    // Without a place that is told, the compiler may leave the memory out.
+    [[maybe_unused]] static const void* volatile place = nullptr;
     struct Element
     {
         Element() = default;
-        Element(const Element&) { throw std::bad_alloc(); }
-        void* memory = nullptr;
+        Element(const Element&)
+        {
+            place = this;
+            throw std::bad_alloc();
+        }
     };
     const std::vector<Element> elements(1);
     const long before = live;
