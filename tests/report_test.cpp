@@ -222,6 +222,8 @@ std::vector<ExportCase> ExportCases()
          "5 warning count-differs FESTWERTEBLOCK A\n"
          "5 warning text-altered FESTWERTEBLOCK A\n"
          "5 warning text-altered FESTWERTEBLOCK A\n"},
+        {"texts that only this reader splits as they were", texts({L"a\\\"   \"1", L"b"}),
+         "5 warning text-altered FESTWERTEBLOCK A\n"},
         {"a count alone",
          [](DCMConverter& d) {
              DCMFestwerteblock b;

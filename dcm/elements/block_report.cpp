@@ -672,8 +672,11 @@ void BlockReport::CountDiffers(std::int64_t count, std::size_t items, const wcha
 void BlockReport::Add(FindingKind kind, Severity severity, std::int64_t line,
                       std::initializer_list<MessagePart> message) noexcept
 {
-    if (m_compared && IsOfAlteredContent(kind))
+    if (m_compared && IsOfAlteredContent(kind)) {
+        if (!m_altered || m_altered->severity < severity)
+            m_altered = {kind, severity};
         return;
+    }
     if (m_findings.Count(kind, severity))
         m_findings.List(kind, severity, line, Label(), message);
 }

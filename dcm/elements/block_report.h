@@ -8,7 +8,9 @@
 #include <cstddef>
 #include <cstdint>
 #include <initializer_list>
+#include <optional>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 class DCMBaseType;
@@ -66,9 +68,16 @@ public:
         kReplaced,
     };
     void SetBadBytes(BadBytes badBytes) { m_badBytes = badBytes; }
-    /// From here on the blocks are compared with those that they were written from, which finds all
-    /// that was altered: only other things are reported.
+    /// From here on the blocks are compared with those that they were written from. What is found
+    /// altered is not reported; the worst of a block can be taken.
     void LeaveAlteredToComparison() { m_compared = true; }
+    /// A kind of finding with its severity.
+    struct Altered
+    {
+        FindingKind kind;
+        Severity severity;
+    };
+    std::optional<Altered> TakeAltered() { return std::exchange(m_altered, std::nullopt); }
 
     // For who cuts the file into blocks.
 
@@ -197,6 +206,7 @@ private:
     bool m_labelled = false;
     BadBytes m_badBytes = BadBytes::kNone;
     bool m_compared = false;
+    std::optional<Altered> m_altered;
     bool m_inComment = false;
     std::size_t m_index = 0;
     /// Whether the current line needs no further check.

@@ -16,6 +16,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <type_traits>
@@ -173,8 +174,18 @@ public:
         }
     }
 
+    /// Adds what the reader found altered, unless the comparison found as much.
+    void AddAltered(BlockReport::Altered altered)
+    {
+        if (!m_worst || *m_worst < altered.severity) {
+            Add(altered.kind, altered.severity,
+                {L"A text is written so that what is between its quotes is another text."});
+        }
+    }
+
     void Add(FindingKind kind, Severity severity, std::initializer_list<MessagePart> message)
     {
+        m_worst = m_worst ? std::max(*m_worst, severity) : severity;
         m_findings.Add(kind, severity, m_line, m_label, message);
     }
     void Add(FindingKind kind, std::initializer_list<MessagePart> message)
@@ -303,6 +314,8 @@ private:
     FindingList& m_findings;
     std::int64_t m_line;
     const CString& m_label;
+    /// The worst finding so far.
+    std::optional<Severity> m_worst;
 };
 
 /// Whether a curve has numbers that no file holds.
@@ -367,6 +380,7 @@ private:
         CString label(KeywordOf(wrote.kind));
         label.Append(L" ").Append(wrote.name);
         const bool written = Read(file);
+        const auto altered = m_report.Block().TakeAltered();
         Comparer comparer(m_findings, written ? line : 0, label);
         if (hasUnwrittenNumbers) {
             comparer.Add(FindingKind::kValueNotWritten,
@@ -381,6 +395,8 @@ private:
                                  L" blocks, or as one of another kind."});
         }
         comparer.Compare(wrote, read.front());
+        if (altered)
+            comparer.AddAltered(*altered);
         m_report.Keep(block, static_cast<std::size_t>(wrote.kind), line, {}, false);
     }
 
