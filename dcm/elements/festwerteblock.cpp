@@ -137,8 +137,11 @@ void ReportValues(dcm::BlockReport& report, std::string_view declared,
     const std::int64_t x = block.GetXValueCount(), y = block.GetYValueCount();
     const bool read = report.Count(dcm::TrimWhite(declared.substr(0, at)), x) &&
                       report.Count(dcm::TrimWhite(declared.substr(at + 1)), y);
-    if (read && (x * y != static_cast<std::int64_t>(values) || (x == 0) != (y == 0)))
-        report.CountDiffers(x * y, values, L"values");
+    if (read && (x * y != static_cast<std::int64_t>(values) || (x == 0) != (y == 0))) {
+        report.AddToBlock(
+            dcm::FindingKind::kCountDiffers,
+            {L"The first line declares ", x, L" @ ", y, L" values, but there are ", values, L"."});
+    }
 }
 
 /// Appends the lines of values: the numbers, or the texts where there are none.
