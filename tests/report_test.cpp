@@ -224,6 +224,14 @@ std::vector<ExportCase> ExportCases()
          "5 warning text-altered FESTWERTEBLOCK A\n"},
         {"texts that only this reader splits as they were", texts({L"a\\\"   \"1", L"b"}),
          "5 warning text-altered FESTWERTEBLOCK A\n"},
+        {"a tab before a name",
+         [](DCMConverter& d) {
+             DCMTextstring b;
+             b.SetName(L"\ta");
+             b.SetValue(CComVariant(L"b"));
+             d.AddTextstring(b);
+         },
+         "5 warning text-trimmed TEXTSTRING \ta\n"},
         {"a count alone",
          [](DCMConverter& d) {
              DCMFestwerteblock b;
