@@ -51,7 +51,7 @@ public:
         std::ostringstream text;
         text.imbue(std::locale::classic());
         text << std::scientific << std::setprecision(779)
-             << (static_cast<long double>(number) + next) / 2;
+             << static_cast<long double>(number) / 2 + static_cast<long double>(next) / 2;
         const std::string digits = text.str();
         return digits.substr(0, digits.find('e')) + "01"[Below(2)] +
                digits.substr(digits.find('e'));
