@@ -453,6 +453,7 @@ TEST(Report, IsEmptiedByTheNextCall)
     dcm::Report copy;
     copy = moved;
     EXPECT_EQ(copy.Count(dcm::Severity::kError), 1U);
+    EXPECT_EQ(copy.Count("cannot-open"), 1U);
     EXPECT_EQ(copy.Cause(), CFileException::fileNotFound);
     EXPECT_NE(copy.SystemError(), 0);
     EXPECT_EQ(dcm::Report(report).Count(), 0U) << "a report without content";
