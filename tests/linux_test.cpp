@@ -402,10 +402,12 @@ TEST(LinuxFile, ReportsAFullDevice)
 
 TEST(LinuxFile, ReportsThatItCannotBeRead)
 {
+    const Folder folder;
+    const CString path = folder / L"in.dcm";
+    WriteBytes(path, "x");
     DCMConverter document;
     dcm::Report report;
-    Under({"read", 1, EIO},
-          [&] { EXPECT_EQ(dcm::Import(document, DCM_ALL_KINDS, report), E_UNEXPECTED); });
+    Under({"read", 1, EIO}, [&] { EXPECT_EQ(dcm::Import(document, path, report), E_UNEXPECTED); });
     EXPECT_EQ(report.Count(), 1U);
     EXPECT_EQ(report.Count("cannot-read"), 1U);
 }
@@ -416,7 +418,7 @@ TEST(Save, LeavesTheOldFileWhenACallFails)
     const CString path = folder / L"out.dcm";
     const std::filesystem::path place = PathOf(path).parent_path();
     DCMConverter document;
-    ASSERT_EQ(document.Import(DCM_ALL_KINDS), S_OK);
+    ASSERT_EQ(ImportBytes(document, ReadBytes(CString(DCM_ALL_KINDS))), S_OK);
     const auto files = [&] {
         return std::distance(std::filesystem::directory_iterator(place), {});
     };

@@ -466,9 +466,12 @@ TEST(Report, IsEmptiedByTheNextCall)
 
 TEST(Findings, OfTheSampleAreNotesAndATruthWord)
 {
+    const Folder folder;
+    const CString path = folder / L"in.dcm";
+    WriteBytes(path, ReadBytes(CString(DCM_SAMPLE)));
     DCMConverter document;
     dcm::Report report;
-    EXPECT_EQ(dcm::Import(document, DCM_SAMPLE, report), S_OK);
+    EXPECT_EQ(dcm::Import(document, path, report), S_OK);
     EXPECT_EQ(report.Count(dcm::Severity::kError), 0U);
     EXPECT_EQ(report.Count(dcm::Severity::kWarning), report.Count("truth-word"));
     DCMConverter copy;
