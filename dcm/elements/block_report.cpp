@@ -453,11 +453,14 @@ void BlockReport::SingleNumber(std::string_view token, double value)
     SingleValue();
     if (token.empty())
         return;
-    if (token != TrimWhite(m_rest)) {
-        Add(FindingKind::kTextAltered,
-            {L"The quotes around the number ", Quote(token), L" are not kept."});
-    }
+    Numbers(token);
     Number(token, value);
+}
+
+void BlockReport::Numbers(std::string_view kept)
+{
+    if (kept != TrimWhite(m_rest))
+        Add(FindingKind::kTextAltered, {L"The quotes around ", Quote(kept), L" are not kept."});
 }
 
 void BlockReport::SingleText(std::string_view kept)

@@ -117,6 +117,8 @@ public:
     void SingleNumber(std::string_view token, double value);
     void SingleText(std::string_view kept);
     void TruthWord();
+    /// What was kept of a line of numbers, without quotes.
+    void Numbers(std::string_view kept);
     /// One number of a line was read from `token` as `value`.
     void Number(std::string_view token, double value);
     /// The items on the line are not kept: texts under a keyword for numbers, or the reverse.

@@ -195,6 +195,8 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwerteblock& block)
         } else if (line.Is(keyword::kEinheitW)) {
             block.m_strUnit = reader.Attribute(rest);
         } else if (line.Is(keyword::kWert)) {
+            if (report != nullptr)
+                report->Numbers(rest);
             ReadNumberLine(rest, report, block.m_vecDoubleValues);
         } else if (line.Is(keyword::kText)) {
             ReadTextLine(TrimWhite(rest), text, report, block.m_listStringValues);
