@@ -41,10 +41,16 @@ addEventListener('keydown', event => {
     search.focus();
     search.select();
   } else if (event.key === 'Escape') {
+    const tipWasShown = !tip.hidden;
     hideTip();
-    if (event.target === search || search.value) {
+    if (event.target === search) {
       search.value = '';
       find();
+    } else if (search.value && !tipWasShown) {
+      search.value = '';
+      find();
+      if (here !== null)
+        jump(here); // Other blocks take their places around it.
     }
     closeIndex();
   } else if (event.target.matches?.('.grid td')) {
