@@ -189,7 +189,9 @@ HRESULT dcm::BlockIo::Read(const FileBlock& lines, DCMFestwerteblock& block)
             std::string_view counts = rest;
             block.SetName(reader.NameWord(TakeWord(counts)));
             ReadCounts(counts, text, block.m_nXValueCount, block.m_nYValueCount);
-            declared = counts;
+            // With quotes that are not part of a count, so that they are reported.
+            declared = TrimWhite(line.rest);
+            TakeWord(declared);
         } else if (ReadAttribute(line.keyword, rest, rest, reader, block)) {
             continue;
         } else if (line.Is(keyword::kEinheitW)) {
