@@ -144,6 +144,11 @@ std::vector<std::string> HeadOf(const std::string& keyword, std::string_view res
     if (keyword == "FESTWERT" || keyword == "TEXTSTRING")
         return {keyword, std::string(Strip(rest, " \t\v\f\r\""))};
     std::vector<std::string> head = Words(rest);
+    // The second count need not be apart from the sign.
+    if (head.size() == 3 && head[2].size() > 1 && head[2][0] == '@') {
+        head.push_back(head[2].substr(1));
+        head[2] = "@";
+    }
     // Counts are decimal numbers, in whatever form.
     for (std::size_t i = 1; i < head.size(); ++i)
         head[i] = head[i] == "@" ? head[i] : std::to_string(std::atoi(head[i].c_str()));
