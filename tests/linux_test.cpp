@@ -384,8 +384,8 @@ TEST(LinuxFile, AsksForLargePagesOnlyInMemoryOfItsOwn)
     const Folder folder;
     const CString path = folder / L"a";
     WriteBytes(path, "\n");
-    // The C library takes small pieces from the heap, which the host goes on using.
-    for (const auto& [size, advised] : {std::pair(100'000, 0), {8 << 20, 0}, {64 << 20, 1}}) {
+    // Small pieces come from the heap, which the host goes on using.
+    for (const auto& [size, advised] : {std::pair(100'000, 0), {3 << 20, 0}, {8 << 20, 1}}) {
         std::filesystem::resize_file(PathOf(path), static_cast<std::uintmax_t>(size));
         advices = 0;
         PravFile(path, kRead);

@@ -34,9 +34,13 @@ long ReadSome(FileHandle file, void* buffer, std::size_t count, std::size_t& don
 /// Writes up to `count` bytes; `done` is how many the system took.
 long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size_t& done) noexcept;
 
-/// Announces that all of this memory is about to be filled. Where the system can, it then comes in
-/// large pages, each of which costs one page fault; elsewhere nothing changes.
-void ExpectToFill(void* memory, std::size_t size) noexcept;
+/// Memory for `size` bytes of a text, to be released by `ReleaseMemory`. Much memory has pages of
+/// its own, which no other part of the program uses: large ones where the system has them, each of
+/// which costs one page fault. Throws `std::bad_alloc`.
+char* TakeMemory(std::size_t size);
+
+/// Releases memory that was taken for `size` bytes.
+void ReleaseMemory(char* memory, std::size_t size) noexcept;
 
 /// Closes a file. With `endUse` the exclusive use ends, even while child processes have the file
 /// open too; without, it lasts until every process has closed the file.

@@ -2,6 +2,7 @@
 
 #include "dcm/platform/cstring.h"
 #include "dcm/platform/encoding.h"
+#include "dcm/platform/system_file.h"
 #include "dcm/platform/text.h"
 #include "dcm/platform/word.h"
 #include "dcm/textfile/shared_texts.h"
@@ -25,7 +26,9 @@ public:
     /// No bytes, and no memory for them.
     TextBuffer() = default;
     /// Memory for up to `room` bytes. `EndAt` must be called after they are written.
-    explicit TextBuffer(std::size_t room) : m_bytes(new char[room + kReadAhead]) {}
+    explicit TextBuffer(std::size_t room)
+        : m_bytes(system::TakeMemory(room + kReadAhead), Release{room + kReadAhead})
+    {}
 
     char* Data() { return m_bytes.get(); }
     /// Sets the number of bytes and writes the zeros after them.
@@ -38,7 +41,12 @@ public:
     std::string_view Bytes() const { return {m_bytes.get(), m_size}; }
 
 private:
-    std::unique_ptr<char[]> m_bytes;
+    struct Release
+    {
+        std::size_t size;
+        void operator()(char* memory) const noexcept { system::ReleaseMemory(memory, size); }
+    };
+    std::unique_ptr<char[], Release> m_bytes;
     std::size_t m_size = 0;
 };
 

@@ -1,6 +1,5 @@
 #include "dcm/textfile/pravfile.h"
 
-#include "dcm/platform/system_file.h"
 #include "dcm/textfile/file_text.h"
 #include "dcm/textfile/file_text_builder.h"
 #include "dcm/textfile/pravfile_content.h"
@@ -54,7 +53,6 @@ void PravFile::LoadContent(UINT flags)
     auto content = std::make_unique<Content>();
     const auto size = static_cast<std::size_t>(status.m_size);
     dcm::TextBuffer bytes(size);
-    dcm::system::ExpectToFill(bytes.Data(), size);
     bytes.EndAt(Read(bytes.Data(), static_cast<UINT>(size)));
     content->m_strContent = dcm::FileText::OfFile(std::move(bytes));
     // A conversion to UTF-8 may lengthen the text.

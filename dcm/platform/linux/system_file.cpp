@@ -5,7 +5,7 @@
 
 #include <cerrno>
 #include <fcntl.h>
-#include <memory>
+#include <new>
 #include <sys/file.h>
 #include <sys/mman.h>
 #include <sys/stat.h>
@@ -14,6 +14,9 @@
 namespace dcm::system {
 
 namespace {
+
+/// Memory of this size and more has pages of its own. It is twice the size of a large page.
+constexpr std::size_t kOwnPages = std::size_t{4} << 20;
 
 /// Closes the file unless it is released.
 class OpeningFile
@@ -126,18 +129,25 @@ long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size
     }
 }
 
-void ExpectToFill(void* memory, std::size_t size) noexcept
+char* TakeMemory(std::size_t size)
 {
-    // From this size on the C library takes memory from the system for each piece alone and returns
-    // it when the piece is released. Smaller pieces may be parts of the heap that the host goes on
-    // using.
-    constexpr std::size_t ownMemory = std::size_t{32} << 20;
-    if (size < ownMemory)
-        return;
-    // The whole pages in it.
-    const auto page = static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
-    if (std::align(page, page, memory, size) != nullptr)
-        ::madvise(memory, size / page * page, MADV_HUGEPAGE); // Only a hint.
+    if (size < kOwnPages)
+        return static_cast<char*>(::operator new(size));
+    void* const memory =
+        mmap(nullptr, size, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
+    if (memory == MAP_FAILED)
+        throw std::bad_alloc();
+    madvise(memory, size, MADV_HUGEPAGE); // Only a hint.
+    return static_cast<char*>(memory);
+}
+
+void ReleaseMemory(char* memory, std::size_t size) noexcept
+{
+    if (size < kOwnPages) {
+        ::operator delete(memory);
+    } else {
+        munmap(memory, size);
+    }
 }
 
 long CloseFile(FileHandle file, bool endUse) noexcept

@@ -1,6 +1,7 @@
 #include "dcm/platform/system_file.h"
 
 #include <algorithm>
+#include <new>
 
 namespace dcm::system {
 
@@ -124,8 +125,15 @@ long WriteSome(FileHandle file, const void* buffer, std::size_t count, std::size
     return 0;
 }
 
-void ExpectToFill(void*, std::size_t) noexcept
-{}
+char* TakeMemory(std::size_t size)
+{
+    return static_cast<char*>(::operator new(size));
+}
+
+void ReleaseMemory(char* memory, std::size_t /*size*/) noexcept
+{
+    ::operator delete(memory);
+}
 
 long CloseFile(FileHandle file, bool /*endUse*/) noexcept
 {
