@@ -130,10 +130,15 @@ void AddLine(Content& block, const std::string& keyword, std::string_view rest)
         AppendItems(block.y, rest);
         block.rows.resize(block.y.size(), block.values.size());
     } else if (keyword == "WERT" || keyword == "TEXT") {
+        const std::string_view said = Strip(rest, kWhite);
+        const bool list = block.head[0] == "FESTWERTEBLOCK";
         if (single) {
             SetSingleValue(block, keyword, rest);
+        } else if (list && keyword == "TEXT" && !said.empty() && !said.starts_with('"')) {
+            // Without quotes the whole rest of the line is one text.
+            block.values.push_back({false, 0, std::string(said)});
         } else {
-            AppendItems(block.values, rest, block.head[0] == "FESTWERTEBLOCK");
+            AppendItems(block.values, rest, list);
         }
     }
 }
