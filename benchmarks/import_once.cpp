@@ -1,4 +1,4 @@
-// import_once dcm|reported|floor FILE
+// import_once dcm|report|floor FILE
 // Reads a file once, with a report or without, in a new process that uses the shared library.
 // Prints the time in seconds and the peak memory of the process in bytes.
 
@@ -14,18 +14,12 @@ int main(int argc, char** argv)
 {
     using namespace dcm::bench;
     if (argc != 3) {
-        std::cerr << "usage: import_once dcm|reported|floor FILE\n";
+        std::cerr << "usage: import_once dcm|report|floor FILE\n";
         return EXIT_FAILURE;
     }
     double seconds = 0;
     if (argv[1] == std::string_view("floor")) {
         const BlockNumbers blocks = Timed(seconds, [&] { return ReadFloor(argv[2]); });
-    } else if (argv[1] == std::string_view("reported")) {
-        DCMConverter document;
-        dcm::Report report;
-        const auto import = [&] { return dcm::Import(document, CString(argv[2]), report); };
-        if (Timed(seconds, import) != S_OK)
-            return EXIT_FAILURE;
     } else if (argv[1] == std::string_view("report")) {
         DCMConverter document;
         dcm::Report report;

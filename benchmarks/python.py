@@ -93,7 +93,7 @@ def main():
             small_files(folder, pool)  # starts the processes
             for i in range(options.rounds):
                 print(f"\rround {i + 1} of {options.rounds}", end="", file=sys.stderr, flush=True)
-                reported, unreported = library("reported", large), library("dcm", large)
+                reported, unreported = library("report", large), library("dcm", large)
                 reading, at_once, one_by_one = own_process(large)
                 bulk.append((reading + at_once) / reported)
                 plain.append((reading + at_once) / unreported)

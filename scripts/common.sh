@@ -6,8 +6,6 @@ cd "$(dirname "${BASH_SOURCE[0]}")/.." || exit
 if command -v ccache >/dev/null; then
     export CMAKE_C_COMPILER_LAUNCHER=ccache CMAKE_CXX_COMPILER_LAUNCHER=ccache
     export CCACHE_BASEDIR=$PWD CCACHE_NOHASHDIR=1
-    # It reads no list of a sanitizer by itself.
-    export CCACHE_EXTRAFILES=$PWD/cmake/ubsan-ignore.txt
 fi
 export CMAKE_BUILD_PARALLEL_LEVEL=${CMAKE_BUILD_PARALLEL_LEVEL:-$(nproc)}
 
@@ -40,6 +38,10 @@ as_root() {
 
 # Configures and builds the preset named.
 build() {
+    # ccache does not look into the list of what a sanitizer leaves out.
+    if [[ $1 == ubsan-clang ]]; then
+        local -x CCACHE_EXTRAFILES=$PWD/cmake/ubsan-ignore.txt
+    fi
     quietly cmake --preset "$1" && quietly cmake --build --preset "$1"
 }
 
