@@ -68,7 +68,8 @@ std::wstring_view Trimmed(std::wstring_view text)
 {
     constexpr const wchar_t* trimmed = L"\" \t\n\v\f\r";
     text.remove_prefix(std::min(text.find_first_not_of(trimmed), text.size()));
-    // One past the last other character; 0 where there is none.
+    if (text.empty())
+        return text;
     return text.substr(0, text.find_last_not_of(trimmed) + 1);
 }
 
