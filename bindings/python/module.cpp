@@ -136,19 +136,6 @@ py::list Diff(const py::list& oldItems, const py::list& newItems, double absolut
     return ToPython(differences);
 }
 
-/// The values of all parameters by name; of equal names the first.
-py::dict Arrays(const Document& document)
-{
-    py::dict arrays;
-    for (const Parameter& parameter : document.parameters) {
-        const py::str name = Text(parameter.name);
-        const py::array values = ValuesOf(parameter);
-        if (PyDict_SetDefault(arrays.ptr(), name.ptr(), values.ptr()) == nullptr)
-            throw py::error_already_set();
-    }
-    return arrays;
-}
-
 py::tuple Kinds()
 {
     py::tuple keywords(kKinds.size());
@@ -177,7 +164,7 @@ PYBIND11_MODULE(_dcm, m)
                      kinds += static_cast<char>(parameter.kind);
                  return py::bytes(kinds);
              })
-        .def("arrays", &Arrays)
+        .def("arrays", [](const Document& document) { return ArraysOf(document.parameters); })
         .def("values", [](const Document& document,
                           std::size_t index) { return ValuesOf(document.At(index)); })
         .def("attributes", [](const Document& document, std::size_t index) {

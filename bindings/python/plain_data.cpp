@@ -28,14 +28,20 @@ py::object Entry(const CComVariant& value)
     return py::none();
 }
 
-/// A new array without content. pybind11's own constructors take several times as long, which
-/// counts for the many small ones of a file.
-py::array NewArray(const py::dtype& type, const Shape& shape)
+/// A new array, of the memory at `content` or, if that is null, of memory of its own without
+/// content. pybind11's own constructors take several times as long, which counts for the many small
+/// arrays of a file.
+py::array NewArray(const py::dtype& type, const Shape& shape, void* content = nullptr)
 {
-    const auto& numpy = py::detail::npy_api::get();
+    using Numpy = py::detail::npy_api;
+    const Numpy& numpy = Numpy::get();
+    const int flags = content == nullptr
+                          ? 0
+                          : Numpy::NPY_ARRAY_C_CONTIGUOUS_ | Numpy::NPY_ARRAY_ALIGNED_ |
+                                Numpy::NPY_ARRAY_WRITEABLE_;
     PyObject* const array = numpy.PyArray_NewFromDescr_(
         numpy.PyArray_Type_, py::dtype(type).release().ptr(), shape.dimensions,
-        shape.lengths.data(), nullptr, nullptr, 0, nullptr);
+        shape.lengths.data(), nullptr, content, flags, nullptr);
     if (array == nullptr)
         throw py::error_already_set();
     return py::reinterpret_steal<py::array>(array);
@@ -53,18 +59,24 @@ py::array ObjectArray(const std::vector<CComVariant>& values, const Shape& shape
     return array;
 }
 
+/// Writes numbers to `entries`, not-a-number for entries without a value; false if there is a text.
+bool CopyNumbers(const std::vector<CComVariant>& values, double* entries)
+{
+    for (const CComVariant& value : values) {
+        if (value.vt == VT_BSTR)
+            return false;
+        *entries++ = value.vt == VT_R8 ? value.dblVal : std::numeric_limits<double>::quiet_NaN();
+    }
+    return true;
+}
+
 /// An array of numbers, or of objects if there is a text.
 py::array Array(const std::vector<CComVariant>& values, const Shape& shape)
 {
     py::array array = NewArray(py::dtype::of<double>(), shape);
-    auto* const entries = static_cast<double*>(array.mutable_data());
-    for (std::size_t i = 0; i < values.size(); ++i) {
-        if (values[i].vt == VT_BSTR)
-            return ObjectArray(values, shape);
-        entries[i] =
-            values[i].vt == VT_R8 ? values[i].dblVal : std::numeric_limits<double>::quiet_NaN();
-    }
-    return array;
+    return CopyNumbers(values, static_cast<double*>(array.mutable_data()))
+               ? array
+               : ObjectArray(values, shape);
 }
 
 py::array Points(const Axis& axis)
@@ -168,6 +180,35 @@ py::array ValuesOf(const Parameter& parameter)
     const Shape shape = ShapeOf(parameter);
     return parameter.kind == Kind::kTextstring ? ObjectArray(parameter.values, shape)
                                                : Array(parameter.values, shape);
+}
+
+py::dict ArraysOf(const std::vector<Parameter>& parameters)
+{
+    std::size_t size = 0;
+    for (const Parameter& parameter : parameters)
+        size += parameter.values.size();
+    const py::dtype number = py::dtype::of<double>();
+    py::array numbers = NewArray(number, {1, {static_cast<py::ssize_t>(size), 0}});
+    auto* place = static_cast<double*>(numbers.mutable_data());
+    const auto valuesOf = [&](const Parameter& parameter) {
+        const Shape shape = ShapeOf(parameter);
+        if (parameter.kind == Kind::kTextstring || !CopyNumbers(parameter.values, place))
+            return ObjectArray(parameter.values, shape);
+        py::array view = NewArray(number, shape, place);
+        place += parameter.values.size();
+        if (py::detail::npy_api::get().PyArray_SetBaseObject_(view.ptr(),
+                                                              numbers.inc_ref().ptr()) != 0)
+            throw py::error_already_set();
+        return view;
+    };
+
+    py::dict arrays;
+    for (const Parameter& parameter : parameters) {
+        const py::str name = Text(parameter.name);
+        if (PyDict_SetDefault(arrays.ptr(), name.ptr(), valuesOf(parameter).ptr()) == nullptr)
+            throw py::error_already_set();
+    }
+    return arrays;
 }
 
 py::tuple AttributesOf(const Parameter& parameter)

@@ -20,6 +20,10 @@ py::str Text(std::wstring_view text);
 /// and rows that are filled, otherwise one.
 py::array ValuesOf(const Parameter& parameter);
 
+/// `ValuesOf` all by name, of equal names the first. The arrays of numbers lie in one block of
+/// memory, as an allocation for each would take a third of the time.
+py::dict ArraysOf(const std::vector<Parameter>& parameters);
+
 /// Langname, displayname, function, unit, countX, countY, and for x and y each unit, distribution
 /// and points.
 py::tuple AttributesOf(const Parameter& parameter);

@@ -120,7 +120,8 @@ class Calibration(Mapping[str, Parameter]):
     def arrays(self) -> dict[str, NDArray[Any]]:
         """Copies of the values of all parameters by name, as `Parameter.values` has them.
 
-        Faster than asking each parameter. Of names that stand twice it has the first.
+        Faster than asking each parameter. Of names that stand twice it has the first. After a read
+        the arrays of numbers are views of one block of memory: to keep a few for long, copy them.
         """
         if self._document is not None:
             return self._document.arrays()

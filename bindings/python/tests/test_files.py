@@ -253,6 +253,9 @@ def test_arrays_are_copies_of_all_values(sample):
                 array.tolist() == sample[name].values.tolist()
             )
             assert not np.shares_memory(array, sample[name].values)
+        for number, array in enumerate(again.values()):
+            array[...] = number
+        assert all((array == number).all() for number, array in enumerate(again.values()))
 
 
 def read_in_process(path):
