@@ -59,10 +59,10 @@ public:
         static constexpr std::array<std::string_view, 6> components = {
             "ZndWnkl", "LdDrck", "Einspr", "Lambda", "AbgTmp", "DrhZhl"};
         static constexpr std::array<std::string_view, 4> subjects = {
-            "Zündwinkel", "Ladedruck", "Einspritzmenge", "Kühlmitteltemperatur"};
+            "Z\u00FCndwinkel", "Ladedruck", "Einspritzmenge", "K\u00FChlmitteltemperatur"};
         static constexpr std::array<std::string_view, 4> uses = {
-            "über Drehzahl und Füllung", "für den Kaltstart", "bei Überdrehzahl, begrenzt",
-            "(Rückfallwert)"};
+            "\u00FCber Drehzahl und F\u00FCllung", "f\u00FCr den Kaltstart",
+            "bei \u00DCberdrehzahl, begrenzt", "(R\u00FCckfallwert)"};
         Block block;
         block.keyword = keyword;
         block.name = std::string(Pick(components)) + "_" + std::string(Pick(components)) + "." +
@@ -75,8 +75,8 @@ public:
 
     std::string Unit()
     {
-        static constexpr std::array<std::string_view, 8> units = {"°C",     "µs",  "1/min", "°KW",
-                                                                  "mg/Hub", "hPa", "%",     "-"};
+        static constexpr std::array<std::string_view, 8> units = {
+            "\u00B0C", "\u00B5s", "1/min", "\u00B0KW", "mg/Hub", "hPa", "%", "-"};
         return std::string(Pick(units));
     }
 
@@ -231,7 +231,7 @@ Data MakeData(Flavour flavour, double factor, std::uint64_t seed)
     blocks(300, [&] {
         Block block = make.Begin("TEXTSTRING");
         block.unitW.clear();
-        block.text = block.langname + ", geprüft";
+        block.text = block.langname + ", gepr\u00FCft";
         return block;
     });
 

