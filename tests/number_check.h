@@ -46,13 +46,7 @@ public:
         if (Below(4) != 0)
             return DecimalText();
         // Halfway between two numbers, or a little above.
-        const double number = Number();
-        const double next = std::nextafter(number, std::numeric_limits<double>::max());
-        std::ostringstream text;
-        text.imbue(std::locale::classic());
-        text << std::scientific << std::setprecision(779)
-             << static_cast<long double>(number) / 2 + static_cast<long double>(next) / 2;
-        const std::string digits = text.str();
+        const std::string digits = Halfway(Number());
         return digits.substr(0, digits.find('e')) + "01"[Below(2)] +
                digits.substr(digits.find('e'));
     }
@@ -69,6 +63,9 @@ public:
         return std::strtod(local.c_str(), nullptr);
     }
 
+    /// Whether `Parse` gives the nearest numbers: the C library of 32-bit Windows does not.
+    static bool ParsesExactly() { return Parse(Halfway(0x7FFp-1074)) == 0x1p-1063; }
+
 private:
     /// Uses `from_chars`; false for numbers out of range, where the standard library has none for
     /// doubles, and where registers are wider than a double, because libstdc++ rounds twice there.
@@ -78,6 +75,16 @@ private:
         if constexpr (FLT_EVAL_METHOD == 0 && requires { std::from_chars(begin, end, value); })
             return std::from_chars(begin, end, value).ec == std::errc();
         return false;
+    }
+    /// All digits of the number halfway between one and the next.
+    static std::string Halfway(double number)
+    {
+        const double next = std::nextafter(number, std::numeric_limits<double>::max());
+        std::ostringstream text;
+        text.imbue(std::locale::classic());
+        text << std::scientific << std::setprecision(779)
+             << static_cast<long double>(number) / 2 + static_cast<long double>(next) / 2;
+        return text.str();
     }
     std::size_t Below(std::size_t limit) { return static_cast<std::size_t>(m_random() % limit); }
     std::string DecimalText()

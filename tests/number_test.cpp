@@ -54,6 +54,8 @@ TEST(Number, ReadsAndWritesAsItsCasesSay)
 
 TEST(Number, AgreesWithTheStandardLibrary)
 {
+    if (!NumberSource::ParsesExactly())
+        GTEST_SKIP() << "The standard library of this machine reads numbers wrongly.";
     NumberSource source(1);
     std::string line;
     for (std::size_t i = 0; i < 20'000; ++i) {
@@ -70,6 +72,8 @@ TEST(Number, AgreesWithTheStandardLibrary)
 // The ways for numbers that are hard to tell, taken for all numbers.
 TEST(Number, AgreesWithTheStandardLibraryOnTheWaysForHardNumbers)
 {
+    if (!NumberSource::ParsesExactly())
+        GTEST_SKIP() << "The standard library of this machine reads numbers wrongly.";
     NumberSource source(2);
     for (std::size_t i = 0; i < 20'000; ++i) {
         std::string text = source.Text();
