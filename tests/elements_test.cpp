@@ -54,6 +54,7 @@ TEST(Blocks, ReadAndComposeTheirLines)
     EXPECT_EQ((list.*addToList)(numbers), S_OK);
     EXPECT_EQ((list.*listLines)(file), L"    WERT 0.10000000000000001    1.0    0.0   \n");
     list.SetXValueCount(2);
+    EXPECT_EQ((list.*listLines)(file), L"    WERT 0.10000000000000001    1.0    0.0   \n");
     list.SetYValueCount(1);
     EXPECT_EQ((list.*listLines)(file), L"    WERT 0.1    1.0   \n    WERT 0.0   \n");
     EXPECT_THROW((list.*addToList)(none), dcm::ResultError);

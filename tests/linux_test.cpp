@@ -38,8 +38,17 @@ int calls = 0;
 
 /// How often the system was told how memory will be used.
 int advices = 0;
+/// Whether a file was opened so that programs that are started have it open too.
+bool inherited = false;
 /// Whether `write` reports success without writing.
 bool writesNothing = false;
+
+/// The same flags.
+int Noted(int flags)
+{
+    inherited = inherited || (flags & O_CLOEXEC) == 0;
+    return flags;
+}
 
 /// The number of bytes that the call may transfer; negative when it fails.
 ssize_t Room(std::string_view call, std::size_t count)
@@ -69,7 +78,8 @@ extern "C" {
 #define DCM_TEST_WRAP(...) DCM_TEST_WRAP_LINKED(, __VA_ARGS__)
 #define DCM_TEST_WRAP_LARGE(...) DCM_TEST_WRAP_EXPANDED(DCM_TEST_LARGE_FILES, __VA_ARGS__)
 
-DCM_TEST_WRAP_LARGE(int, open, 0, (const char* path, int flags, mode_t mode), (path, flags, mode))
+DCM_TEST_WRAP_LARGE(int, open, 0, (const char* path, int flags, mode_t mode),
+                    (path, Noted(flags), mode))
 DCM_TEST_WRAP_LARGE(int, fstat, 0, (int file, struct stat* status), (file, status))
 DCM_TEST_WRAP(int, flock, 0, (int file, int operation), (file, operation))
 DCM_TEST_WRAP_LARGE(int, ftruncate, 0, (int file, off_t length), (file, length))
@@ -369,12 +379,14 @@ TEST(LinuxFile, IsNotInheritedAndMayHaveAnyHandle)
     file.Close();
     EXPECT_EQ(fcntl(STDIN_FILENO, F_GETFD), -1);
     const DCMConverter document;
+    inherited = false;
     for (const wchar_t* const name : {L"new", L"file"}) {
         dcm::Report report;
         EXPECT_EQ(dcm::Save(document, folder / name, report), S_OK);
         EXPECT_EQ(ReadBytes(folder / name), ExportBytes(document));
         EXPECT_EQ(fcntl(STDIN_FILENO, F_GETFD), -1) << dcm::ToUtf8(name);
     }
+    EXPECT_FALSE(inherited);
     dup2(input, STDIN_FILENO);
     close(input);
 }

@@ -253,8 +253,10 @@ TEST(CodePages, ConvertAsTheirCasesSay)
     EXPECT_TRUE(dcm::SetThreadCodePage(65001));
     std::thread([] { dcm::SetThreadCodePage(1252); }).join();
     EXPECT_EQ(dcm::ThreadCodePage(), 65001U);
-    const std::wstring half(1, static_cast<wchar_t>(0xD800));
-    EXPECT_EQ(Narrow(L"\u00B5" + half), "\xC2\xB5\xEF\xBF\xBD") << "each thread has its own page";
+    for (const int half : {0xD800, 0xDC00}) {
+        const std::wstring text{L'\u00B5', static_cast<wchar_t>(half)};
+        EXPECT_EQ(Narrow(text), "\xC2\xB5\xEF\xBF\xBD") << "each thread has its own page";
+    }
     EXPECT_TRUE(dcm::SetThreadCodePage(1252));
 }
 
