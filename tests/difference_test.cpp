@@ -202,6 +202,14 @@ TEST(Differences, CompareValuesAtEqualPoints)
          "~ FESTWERTEBLOCK a 0>0 X '2'>'3' w3>4 4>5 w->2 [0]>9 w->5 [0]>9\n"},
     };
     ExpectAll(cases);
+    // A host's counts that make no rows.
+    std::vector<Parameter> before = Read(cases[0].before);
+    before[0].kind = dcm::Kind::kFestwerteblock;
+    before[0].countX = 3;
+    std::vector<Parameter> after = before;
+    after[0].countX = 2;
+    after[0].values[2] = 31.0;
+    EXPECT_EQ(Show(dcm::Differences(before, after)), "~ FESTWERTEBLOCK a 0>0 w2>2 30>31\n");
 }
 
 TEST(Differences, TakeNoMoreTimeThanTheContent)

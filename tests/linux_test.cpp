@@ -457,6 +457,14 @@ TEST(Save, LeavesTheOldFileWhenACallFails)
             }
         }
     }
+    // Files are not flushed everywhere.
+    for (const auto& [error, expected] : {std::pair(EIO, kFailed), {EINVAL, S_OK}, {EINTR, S_OK}}) {
+        dcm::Report report;
+        HRESULT result = S_OK;
+        EXPECT_TRUE(
+            Under({"fsync", 1, error}, [&] { result = dcm::Save(document, path, report); }));
+        EXPECT_EQ(result, expected) << error;
+    }
 }
 
 TEST(Save, KeepsLinksAndModes)
@@ -478,6 +486,15 @@ TEST(Save, KeepsLinksAndModes)
         EXPECT_EQ(ReadBytes(file), content);
     }
     EXPECT_EQ(fs::status(PathOf(file)).permissions(), fs::perms(0640));
+    // As many links as the system follows, and one more.
+    CString last = first;
+    for (int links = 2; links < 41; ++links) {
+        const CString next = last + L"_";
+        EXPECT_EQ(dcm::Save(document, last, report), S_OK) << links;
+        fs::create_symlink(PathOf(last), PathOf(next));
+        last = next;
+    }
+    EXPECT_EQ(dcm::Save(document, last, report), E_UNEXPECTED);
     // A name of bytes that are no UTF-8, and links in a circle.
     fs::remove(PathOf(second));
     fs::create_symlink("\xff", PathOf(second));

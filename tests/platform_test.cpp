@@ -204,6 +204,7 @@ TEST(Variant, RefusesTagsThatItDoesNotKnow)
 
 TEST(Results, AreTheNumbersThatHostsKnow)
 {
+    static_assert(VT_BSTR == 8 && VT_BOOL == 11 && VT_VARIANT == 12 && VT_UI4 == 19);
     VARIANT unknown{};
     unknown.vt = 99;
     const auto raised = [](const CString& text) {
