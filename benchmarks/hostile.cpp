@@ -30,7 +30,7 @@ constexpr double kGrowthLimit = 12;
 constexpr double kMemoryLimit = 12;
 
 /// The smaller size: large enough that both get their memory from the system.
-constexpr std::size_t kBytes = 1U << 20U;
+constexpr std::size_t kBytes = 4U << 20U;
 
 /// `before`, then `unit` repeated up to the size, then `after`.
 struct HostileText
