@@ -72,7 +72,7 @@ def table(rows):
 def main():
     parser = argparse.ArgumentParser(prog="bench python")
     parser.add_argument("--write", action="store_true", help="renew docs/performance.md")
-    parser.add_argument("--rounds", type=int, default=5)
+    parser.add_argument("--rounds", type=int, default=9)
     parser.add_argument("--once", help=argparse.SUPPRESS)
     options = parser.parse_args()
     if options.once:

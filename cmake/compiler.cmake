@@ -12,12 +12,15 @@ if(CMAKE_CXX_COMPILER_ID MATCHES "^(GNU|Clang)$")
     set(dcm_call_own_functions -fno-semantic-interposition)
     # The C++ runtime becomes a part of the program or DLL.
     set(dcm_contain_runtime -static)
-    if(MINGW AND CMAKE_SIZEOF_VOID_P EQUAL 4)
+    if(BUILD_SHARED_LIBS AND MINGW AND CMAKE_SIZEOF_VOID_P EQUAL 4)
         # There an exception reaches a host only if it and the DLL share the DLLs of the runtime.
-        foreach(name libgcc_s_dw2-1.dll libstdc++-6.dll libwinpthread-1.dll)
+        foreach(name libgcc_s_dw2-1.dll libgcc_s_sjlj-1.dll libstdc++-6.dll libwinpthread-1.dll)
             execute_process(COMMAND ${CMAKE_CXX_COMPILER} -print-file-name=${name}
                 OUTPUT_VARIABLE path OUTPUT_STRIP_TRAILING_WHITESPACE)
-            list(APPEND dcm_runtime_dlls ${path})
+            # A compiler has one of the first two.
+            if(EXISTS ${path})
+                list(APPEND dcm_runtime_dlls ${path})
+            endif()
         endforeach()
     else()
         set(dcm_contain_runtime_of_hosts ${dcm_contain_runtime})
